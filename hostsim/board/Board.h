@@ -1,0 +1,63 @@
+// The virtual board: devices, user chains and the cores behind each chain's controller core,
+// with NEBU bus masters that execute the seven master commands bit for bit.
+#pragma once
+
+#include <cstdint>
+#include <map>
+#include <memory>
+#include <stdexcept>
+#include <string>
+#include <vector>
+
+#if defined(_WIN32)
+#define NEBU_BOARD_API
+#else
+#define NEBU_BOARD_API __attribute__((visibility("default")))
+#endif
+
+namespace OrvSim {
+
+// A board file that cannot be read or is malformed; what() names the file and the problem.
+class NEBU_BOARD_API BoardError : public std::runtime_error {
+public:
+    using std::runtime_error::runtime_error;
+};
+
+class NEBU_BOARD_API Board {
+public:
+    // Throws BoardError.
+    static std::shared_ptr<Board> loadFile(const std::string& path);
+    // name: used in error messages in place of a file name.
+    static std::shared_ptr<Board> loadText(const std::string& json, const std::string& name);
+
+    virtual ~Board();
+
+    uint32_t deviceCount() const;
+    // User chain numbers of a device that are present in the file, ascending.
+    std::vector<uint32_t> chains(uint32_t device) const;
+    bool isTrellom(uint32_t device) const;
+    // False when the device does not exist; an absent chain has 0 cores.
+    bool coreCount(uint32_t device, uint32_t chain, uint32_t& count) const;
+    // Fills info (word[1] = type) and status bits (bit k = bit k%8 of byte k/8, bitCount
+    // bits, bytes zeroed first). False when the core does not exist.
+    bool coreStatus(uint32_t device, uint32_t chain, uint32_t core, uint32_t info[5],
+                    uint8_t* bits, uint32_t bitCount) const;
+    // Runs one command on a core: dataIn for a write, dataOut (bitCount bits, zeroed first)
+    // for a read. A core without a master ignores writes and reads zeros. False when the
+    // core does not exist.
+    bool runCommand(uint32_t device, uint32_t chain, uint32_t core, uint32_t cmd,
+                    const uint8_t* dataIn, uint8_t* dataOut, uint32_t bitCount);
+
+    // Direct access to a slave's memory on the chain's first bus master, no JTAG.
+    // Throw std::out_of_range when there is no such master or slave.
+    uint16_t peek(uint32_t device, uint32_t chain, uint32_t slave, uint32_t address) const;
+    void poke(uint32_t device, uint32_t chain, uint32_t slave, uint32_t address, uint16_t value);
+
+    struct Impl;
+
+private:
+    explicit Board(std::unique_ptr<Impl> impl);
+    std::unique_ptr<Impl> impl_;
+};
+
+}  // namespace OrvSim
