@@ -6,7 +6,8 @@
 
 namespace OrvRT {
 
-void OrvNebu_ParamChoice::toCSVFile(std::ostream& out, OrvNebu_ParamChoiceAction& action) const {
+void OrvNebu_ParamChoice::toCSVFile(std::ostream& out,
+                                    const OrvNebu_ParamChoiceAction& action) const {
     out << choiceName_;
     std::string bits;
     for (const RegValue& setting : regValueList_) {

@@ -26,7 +26,7 @@ public:
 
     // Writes the choice name and its settings as ",REG=bits", each value as binary digits of
     // the register width the action holds.
-    void toCSVFile(std::ostream& out, OrvNebu_ParamChoiceAction& action) const;
+    void toCSVFile(std::ostream& out, const OrvNebu_ParamChoiceAction& action) const;
 
 private:
     std::string choiceName_;

@@ -41,8 +41,9 @@ void OrvNebu_ParamChoiceAction::addChoiceRegSetting(uint32_t index, uint32_t wid
     choiceList_.back().addRegValue(regName, value);
 }
 
-uint32_t OrvNebu_ParamChoiceAction::getRegWidth(const std::string& regName) {
-    return regWidths_[regName];
+uint32_t OrvNebu_ParamChoiceAction::getRegWidth(const std::string& regName) const {
+    auto it = regWidths_.find(regName);
+    return it == regWidths_.end() ? 0 : it->second;
 }
 
 bool OrvNebu_ParamChoiceAction::hexValuesEqual(const std::string& a, const std::string& b) {

@@ -28,8 +28,9 @@ public:
     // a register is kept.
     void addChoiceRegSetting(uint32_t index, uint32_t width, const std::string& regName,
                              const std::string& value);
-    // The width stored for the register; an unknown register is entered with width 0.
-    uint32_t getRegWidth(const std::string& regName);
+    // The width stored for the register; 0 for a register no choice sets (which is not
+    // entered, so that asking cannot add a register to read).
+    uint32_t getRegWidth(const std::string& regName) const;
 
     const std::vector<OrvNebu_ParamChoice>& getChoiceList() const { return choiceList_; }
 
