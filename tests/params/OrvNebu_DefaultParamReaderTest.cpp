@@ -12,6 +12,7 @@
 #include "base/Orv_AbortException.h"
 #include "hostsim/Sim.h"
 #include "params/OrvNebu_DefaultParamReader.h"
+#include "support/TestHost.h"
 
 using OrvRT::Orv_AbortException;
 using OrvRT::OrvNebu_ActionsMap;
@@ -20,29 +21,26 @@ using OrvRT::OrvNebu_ParamChoiceAction;
 
 namespace {
 
-struct Message {
+struct Said {
     uint32_t handle;
     uint32_t severity;
     std::string text;
-    bool operator==(const Message& o) const {
+    bool operator==(const Said& o) const {
         return handle == o.handle && severity == o.severity && text == o.text;
     }
 };
 
-std::ostream& operator<<(std::ostream& os, const Message& m) {
+std::ostream& operator<<(std::ostream& os, const Said& m) {
     return os << "{" << m.handle << ", " << m.severity << ", \"" << m.text << "\"}";
 }
 
-class ParamReader : public ::testing::Test {
+class ParamReader : public TestHost {
 protected:
     static constexpr uint32_t SESSION = 41;
     static constexpr uint32_t OTHER_SESSION = 42;
 
     void SetUp() override {
-        OrvSim::resetHost();
-        OrvSim::setMessageSink([this](uint32_t h, uint32_t s, const std::string& t) {
-            messages_.push_back({h, s, t});
-        });
+        TestHost::SetUp();
         dir_ = std::filesystem::temp_directory_path() /
                ("nebu_params_" + std::to_string(::testing::UnitTest::GetInstance()->random_seed()) +
                 "_" + ::testing::UnitTest::GetInstance()->current_test_info()->name());
@@ -51,7 +49,7 @@ protected:
 
     void TearDown() override {
         for (uint32_t h : {0u, SESSION, OTHER_SESSION}) OrvSim::endSession(h);
-        OrvSim::resetHost();
+        TestHost::TearDown();
         std::error_code ec;
         std::filesystem::remove_all(dir_, ec);
     }
@@ -74,20 +72,26 @@ protected:
     }
 
     // Loading must fail with Orv_AbortException after exactly these messages.
-    void expectRejected(const std::string& path, const std::vector<Message>& expected) {
-        messages_.clear();
+    void expectRejected(const std::string& path, const std::vector<Said>& expected) {
+        clearMessages();
         const size_t cached = OrvNebu_DefaultParamReader::cachedFileCount(SESSION);
         EXPECT_THROW(load(path), Orv_AbortException);
-        EXPECT_EQ(expected, messages_);
+        EXPECT_EQ(expected, said());
         EXPECT_EQ(cached, OrvNebu_DefaultParamReader::cachedFileCount(SESSION));
     }
 
-    Message parseError(const std::string& path, uint32_t line, const std::string& row) {
+    Said parseError(const std::string& path, uint32_t line, const std::string& row) {
         return {SESSION, 512,
                 "Unable to parse file: " + path + " line:" + std::to_string(line) + ": " + row};
     }
 
-    std::vector<Message> messages_;
+    // Every message so far, with its session.
+    std::vector<Said> said() const {
+        std::vector<Said> all;
+        for (const TestHost::Message& m : messages()) all.push_back({m.handle, m.severity, m.text});
+        return all;
+    }
+
     std::filesystem::path dir_;
 };
 
@@ -103,7 +107,7 @@ const char* const MODE_FILE =
 TEST_F(ParamReader, RowsBecomeChoiceActionsWithLinePriorities) {
     const std::string path = write("p.csv", MODE_FILE);
     OrvNebu_ActionsMap actions = load(path);
-    EXPECT_TRUE(messages_.empty());
+    EXPECT_NO_MESSAGES();
     ASSERT_EQ(2u, actions.size());
     OrvNebu_ParamChoiceAction& mode = choice(actions, "MODE");
     OrvNebu_ParamChoiceAction& level = choice(actions, "LEVEL");
@@ -127,7 +131,7 @@ TEST_F(ParamReader, LineEndingsQuotesAndEmptyFields) {
                                    "A,1,y,\r\n"
                                    "A,2,z,EN=");
     OrvNebu_ActionsMap actions = load(path);
-    EXPECT_TRUE(messages_.empty());
+    EXPECT_NO_MESSAGES();
     OrvNebu_ParamChoiceAction& a = choice(actions, "A");
     ASSERT_EQ(3u, a.getChoiceList().size());
     EXPECT_EQ("x", a.getChoiceList()[0].getChoiceName());
@@ -189,17 +193,19 @@ TEST_F(ParamReader, ChoiceIndexErrorsAreReportedTwice) {
 
 TEST_F(ParamReader, BadBitsAreReportedWithTheRow) {
     const std::string path = write("bits.csv", "h\nMODE,0,Off,EN=2\n");
-    messages_.clear();
+    clearMessages();
     EXPECT_THROW(load(path), Orv_AbortException);
-    ASSERT_EQ(2u, messages_.size());
-    EXPECT_EQ(256u, messages_[0].severity);
-    EXPECT_NE(std::string::npos, messages_[0].text.find('2')) << messages_[0].text;
-    EXPECT_EQ(parseError(path, 2, "MODE,0,Off,EN=2"), messages_[1]);
+    const std::vector<Said> messages = said();
+    ASSERT_EQ(2u, messages.size());
+    EXPECT_EQ(256u, messages[0].severity);
+    // The conversion's own message, naming the bad digits.
+    EXPECT_NE(std::string::npos, messages[0].text.find('2')) << messages[0].text;
+    EXPECT_EQ(parseError(path, 2, "MODE,0,Off,EN=2"), messages[1]);
 }
 
 TEST_F(ParamReader, MissingFileOrDirectory) {
     for (const std::string& path : {(dir_ / "absent.csv").string(), dir_.string()}) {
-        messages_.clear();
+        clearMessages();
         const std::string text = "Unable to open OrvNebu parameter file: " + path;
         try {
             load(path);
@@ -209,7 +215,7 @@ TEST_F(ParamReader, MissingFileOrDirectory) {
         } catch (const std::logic_error& e) {
             EXPECT_EQ(text, e.what());
         }
-        EXPECT_EQ((std::vector<Message>{{SESSION, 256, text}}), messages_);
+        EXPECT_EQ((std::vector<Said>{{SESSION, 256, text}}), said());
     }
     EXPECT_EQ(0u, OrvNebu_DefaultParamReader::cachedFileCount(SESSION));
 }
@@ -220,7 +226,7 @@ TEST_F(ParamReader, HeaderOnlyAndEmptyFilesAreCachedEmpty) {
             write(std::string("h") + std::to_string(std::strlen(content)), content);
         EXPECT_TRUE(load(path).empty());
     }
-    EXPECT_TRUE(messages_.empty());
+    EXPECT_NO_MESSAGES();
     EXPECT_EQ(3u, OrvNebu_DefaultParamReader::cachedFileCount(SESSION));
 }
 
@@ -231,7 +237,7 @@ TEST_F(ParamReader, RepeatedNameKeepsTheFirstAndAMapEntryIsNeverReplaced) {
                                    "LEVEL,0,Low,LVL=0\n"
                                    "MODE,0,Again,EN=1\n");
     OrvNebu_ActionsMap actions = load(path);
-    EXPECT_TRUE(messages_.empty());
+    EXPECT_NO_MESSAGES();
     EXPECT_EQ(10002u, choice(actions, "MODE").getPriority());
     EXPECT_EQ("Off", choice(actions, "MODE").getChoiceList()[0].getChoiceName());
 
@@ -307,7 +313,7 @@ TEST_F(ParamReader, PrintsTheFileBackAndAgainFromTheCache) {
     std::ostringstream out;
     OrvNebu_DefaultParamReader::readAndPrint(path, out);
     EXPECT_EQ(image, out.str());
-    EXPECT_TRUE(messages_.empty());
+    EXPECT_NO_MESSAGES();
 
     // Printed from the cache (session 0): the file is not read again, the header is kept.
     write("p.csv", "Other\nX,0,y,\n");
@@ -316,10 +322,10 @@ TEST_F(ParamReader, PrintsTheFileBackAndAgainFromTheCache) {
     EXPECT_EQ(image, again.str());
 
     // Failures are reported on session 0.
-    messages_.clear();
+    clearMessages();
     const std::string bad = write("bad.csv", "h\nM,0,a\n");
     std::ostringstream none;
     EXPECT_THROW(OrvNebu_DefaultParamReader::readAndPrint(bad, none), Orv_AbortException);
-    EXPECT_EQ((std::vector<Message>{{0, 512, "Unable to parse file: " + bad + " line:2: M,0,a"}}),
-              messages_);
+    EXPECT_EQ((std::vector<Said>{{0, 512, "Unable to parse file: " + bad + " line:2: M,0,a"}}),
+              said());
 }

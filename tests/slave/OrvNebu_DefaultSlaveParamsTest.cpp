@@ -14,12 +14,13 @@
 #include "orvnebu/orvnebu.h"
 #include "params/OrvNebu_DefaultParamReader.h"
 #include "slave/OrvNebu_DefaultSlave.h"
+#include "support/TestHost.h"
 
 using OrvRT::Orv_HashMapCStr;
 
 namespace {
 
-constexpr uint32_t SESSION = 7;
+constexpr uint32_t SESSION = TestHost::HANDLE;
 constexpr uint32_t FAILED = 0x80000000u;
 const ORV_SLAVE_REF CTRL = {0, 1, 0};      // type 0x11: register and parameter file
 const ORV_SLAVE_REF PLAIN = {0, 1, 1};     // type 0x12: no parameter file
@@ -61,12 +62,12 @@ const char* const PARAMETERS =
     "COUNT,1,Zero,WIDE=\n"
     "COUNT,2,Other,\n";
 
-struct Message {
+struct Said {
     uint32_t severity;
     std::string text;
-    bool operator==(const Message& o) const { return severity == o.severity && text == o.text; }
+    bool operator==(const Said& o) const { return severity == o.severity && text == o.text; }
 };
-std::ostream& operator<<(std::ostream& os, const Message& m) {
+std::ostream& operator<<(std::ostream& os, const Said& m) {
     return os << "{" << m.severity << ", \"" << m.text << "\"}";
 }
 
@@ -123,21 +124,19 @@ private:
 };
 
 struct HostMap {
-    HostMap() : handle(OrvContainer_hashmapCStr_new()) {}
-    explicit HostMap(const Orv_HashMapCStr& init) : HostMap() { map() = init; }
+    explicit HostMap(const Orv_HashMapCStr& init = Orv_HashMapCStr())
+        : handle(OrvContainer_hashmapCStr_new()) {
+        map() = init;
+    }
     ~HostMap() { OrvContainer_hashmapCStr_delete(handle); }
     Orv_HashMapCStr& map() { return *static_cast<Orv_HashMapCStr*>(handle); }
     ORV_HASHMAP_HANDLE handle;
 };
 
-class DefaultSlaveParams : public ::testing::Test {
+class DefaultSlaveParams : public TestHost {
 protected:
     void SetUp() override {
-        OrvSim::resetHost();
-        OrvSim::setMessageSink([this](uint32_t h, uint32_t s, const std::string& t) {
-            EXPECT_EQ(SESSION, h);
-            messages_.push_back({s, t});
-        });
+        TestHost::SetUp();
         dir_ = std::filesystem::temp_directory_path() /
                ("nebu_engine_" + std::to_string(::testing::UnitTest::GetInstance()->random_seed()) +
                 "_" + ::testing::UnitTest::GetInstance()->current_test_info()->name());
@@ -145,14 +144,13 @@ protected:
         write("orvnebu_directory.csv", DIRECTORY);
         write("regs.csv", REGISTERS);
         write("params.csv", PARAMETERS);
-        OrvSim::setDataDir(dir_.string());
-        board_ = OrvSim::Board::loadText(BOARD, "engine board");
-        OrvSim::setBoard(board_);
+        setDataDir(dir_.string());
+        board_ = loadBoard(BOARD);
     }
 
     void TearDown() override {
         OrvSim::endSession(SESSION);
-        OrvSim::resetHost();
+        TestHost::TearDown();
         std::error_code ec;
         std::filesystem::remove_all(dir_, ec);
     }
@@ -163,11 +161,12 @@ protected:
 
     void initialize(const ORV_SLAVE_REF& ref) {
         ASSERT_EQ(ORVNEBU_OK, OrvNebu_initialize(SESSION, ref));
-        messages_.clear();
+        clearMessages();
         OrvSim::takeStats(SESSION);
     }
 
     RecordingSlave* registerRecordingSlave() {
+        initialize(CTRL);  // finds the bus
         auto* slave = new RecordingSlave(RECORDED, log_);
         slave->init(SESSION, (dir_ / "regs.csv").string(), (dir_ / "params.csv").string());
         OrvRT::Orv_CoreList::addCore(SESSION, slave);
@@ -198,15 +197,19 @@ protected:
 
     uint16_t word(uint32_t slave, uint32_t address) { return board_->peek(0, 1, slave, address); }
 
-    std::vector<Message> takeMessages() {
-        std::vector<Message> m;
-        m.swap(messages_);
+    // The messages since the previous call, all of which must be for SESSION.
+    std::vector<Said> takeMessages() {
+        std::vector<Said> m;
+        for (const TestHost::Message& message : messages()) {
+            EXPECT_EQ(SESSION, message.handle);
+            m.push_back({message.severity, message.text});
+        }
+        clearMessages();
         return m;
     }
 
     std::filesystem::path dir_;
     std::shared_ptr<OrvSim::Board> board_;
-    std::vector<Message> messages_;
     std::vector<std::string> log_;
 };
 
@@ -277,7 +280,7 @@ TEST_F(DefaultSlaveParams, NothingIsWrittenForEmptyOrUnknownValues) {
 
     // An unknown choice fails before anything is written, also the valid request beside it.
     EXPECT_EQ(FAILED, set(CTRL, {{"MODE", "Fast"}, {"LEVEL", "Max"}}));
-    EXPECT_EQ((std::vector<Message>{
+    EXPECT_EQ((std::vector<Said>{
                   {256, "Setting Parameter 'LEVEL' to value 'Max' is not a valid choice."}}),
               takeMessages());
     EXPECT_EQ(0u, OrvSim::takeStats(SESSION).commands);
@@ -287,10 +290,9 @@ TEST_F(DefaultSlaveParams, NothingIsWrittenForEmptyOrUnknownValues) {
     EXPECT_EQ((Orv_HashMapCStr{{"LEVEL", ""}, {"NOPE", "x"}}),
               get(CTRL, {{"LEVEL", ""}, {"NOPE", "x"}}, FAILED));
     EXPECT_EQ(FAILED, set(CTRL, {{"mode", "On"}}));
-    EXPECT_EQ(
-        (std::vector<Message>{{256, "OrvNebu_getParameter() - Unknown parameter name 'NOPE'"},
-                              {256, "OrvNebu_getParameter() - Unknown parameter name 'mode'"}}),
-        takeMessages());
+    EXPECT_EQ((std::vector<Said>{{256, "OrvNebu_getParameter() - Unknown parameter name 'NOPE'"},
+                                 {256, "OrvNebu_getParameter() - Unknown parameter name 'mode'"}}),
+              takeMessages());
     EXPECT_EQ(0u, OrvSim::takeStats(SESSION).commands);
 }
 
@@ -305,7 +307,7 @@ TEST_F(DefaultSlaveParams, Choices) {
 
     choices(CTRL, {}, FAILED);
     choices(CTRL, {{"Mode", ""}}, FAILED);
-    EXPECT_EQ((std::vector<Message>{
+    EXPECT_EQ((std::vector<Said>{
                   {256,
                    "OrvNebu_getParameterChoices(): 'params' argument has no parameter name passed "
                    "in."},
@@ -315,7 +317,7 @@ TEST_F(DefaultSlaveParams, Choices) {
 
 TEST_F(DefaultSlaveParams, ArgumentChecksComeAfterTheSlave) {
     initialize(CTRL);
-    HostMap params({{"MODE", ""}});
+    HostMap params(Orv_HashMapCStr{{"MODE", ""}});
     ORV_HASHMAP_HANDLE nullHandle = nullptr;
     std::vector<std::string> list;
     void* listHandle = &list;
@@ -328,14 +330,14 @@ TEST_F(DefaultSlaveParams, ArgumentChecksComeAfterTheSlave) {
     EXPECT_EQ(FAILED, OrvNebu_getParameterChoices(SESSION, CTRL, &nullHandle, &listHandle));
     const std::string choicesCheck =
         "OrvNebu_getParameterChoices() argument checking failed:(params != 0) && (choices != 0)";
-    EXPECT_EQ((std::vector<Message>{
-                  {256, "OrvNebu_getParameters() argument checking failed:(params != 0)"},
-                  {256, "OrvNebu_getParameters() argument checking failed:(params != 0)"},
-                  {256, "OrvNebu_setParameters() argument checking failed:(params != 0)"},
-                  {256, choicesCheck},
-                  {256, choicesCheck},
-                  {256, choicesCheck}}),
-              takeMessages());
+    EXPECT_EQ(
+        (std::vector<Said>{{256, "OrvNebu_getParameters() argument checking failed:(params != 0)"},
+                           {256, "OrvNebu_getParameters() argument checking failed:(params != 0)"},
+                           {256, "OrvNebu_setParameters() argument checking failed:(params != 0)"},
+                           {256, choicesCheck},
+                           {256, choicesCheck},
+                           {256, choicesCheck}}),
+        takeMessages());
 
     // No slave object under the reference: that is reported, whatever the arguments.
     const ORV_SLAVE_REF none = {0, 1, 2};
@@ -345,8 +347,7 @@ TEST_F(DefaultSlaveParams, ArgumentChecksComeAfterTheSlave) {
     EXPECT_EQ(FAILED, OrvNebu_getParameters(SESSION, none, nullptr));
     EXPECT_EQ(FAILED, OrvNebu_setParameters(SESSION, none, nullptr));
     EXPECT_EQ(FAILED, OrvNebu_getParameterChoices(SESSION, none, nullptr, nullptr));
-    EXPECT_EQ((std::vector<Message>{{256, unknown}, {256, unknown}, {256, unknown}}),
-              takeMessages());
+    EXPECT_EQ((std::vector<Said>{{256, unknown}, {256, unknown}, {256, unknown}}), takeMessages());
 }
 
 TEST_F(DefaultSlaveParams, ASlaveWithoutParameterFileHasNoParameters) {
@@ -355,7 +356,7 @@ TEST_F(DefaultSlaveParams, ASlaveWithoutParameterFileHasNoParameters) {
     EXPECT_EQ(1u, OrvSim::takeStats(SESSION).roundTrips);
     get(PLAIN, {{"MODE", ""}}, FAILED);
     choices(PLAIN, {{"MODE", ""}}, FAILED);
-    EXPECT_EQ((std::vector<Message>{
+    EXPECT_EQ((std::vector<Said>{
                   {256, "OrvNebu_getParameter() - Unknown parameter name 'MODE'"},
                   {256, "OrvNebu_getParameterChoices(): param 'MODE' is not a valid parameter."}}),
               takeMessages());
@@ -377,11 +378,11 @@ TEST_F(DefaultSlaveParams, ABadParameterFileStopsTheSlave) {
     write("params.csv", "h\nMODE,0,Off,EN=0\nMODE,1,On\n");
     EXPECT_EQ(FAILED, OrvNebu_initialize(SESSION, CTRL));
     const std::string path = (dir_ / "params.csv").string();
-    std::vector<Message> messages = takeMessages();
+    std::vector<Said> messages = takeMessages();
     ASSERT_FALSE(messages.empty());
-    EXPECT_EQ((Message{512, "Unable to parse file: " + path + " line:3: MODE,1,On"}),
+    EXPECT_EQ((Said{512, "Unable to parse file: " + path + " line:3: MODE,1,On"}),
               messages.front());
-    EXPECT_EQ((Message{32768, "Orv abort command"}), messages.back());
+    EXPECT_EQ((Said{32768, "Orv abort command"}), messages.back());
     get(CTRL, {}, FAILED);
     EXPECT_EQ(0u, OrvRT::OrvNebu_DefaultParamReader::cachedFileCount(SESSION));
 }
@@ -437,7 +438,7 @@ TEST_F(DefaultSlaveParams, AnEmptyRequestRunsAnActionOncePerName) {
 
     // A computed parameter has no choices.
     choices(RECORDED, {{"a2", ""}}, FAILED);
-    EXPECT_EQ((std::vector<Message>{
+    EXPECT_EQ((std::vector<Said>{
                   {256, "OrvNebu_getParameterChoices(): param 'a2' is not a choice parameter."}}),
               takeMessages());
 }
