@@ -105,13 +105,16 @@ private:
 // A default slave with computed actions, as the transceiver slaves add theirs.
 class RecordingSlave : public OrvRT::OrvNebu_DefaultSlave {
 public:
-    RecordingSlave(const ORV_SLAVE_REF& ref, std::vector<std::string>& log)
-        : OrvNebu_DefaultSlave(SESSION, ref, info(), Orv_HashMapCStr()), log_(log) {}
+    // ghost: also store A under a name its own list lacks.
+    RecordingSlave(const ORV_SLAVE_REF& ref, std::vector<std::string>& log, bool ghost)
+        : OrvNebu_DefaultSlave(SESSION, ref, info(), Orv_HashMapCStr()), log_(log), ghost_(ghost) {}
     void addToActionsHashMap(uint32_t, OrvRT::OrvNebu_ActionsMap& actions) override {
         // A: three names; Z and Y share a priority, Z added first.
-        add(actions, new RecordingAction("A", {"a1", "a2", "a3"}, 5000, log_));
+        auto* a = new RecordingAction("A", {"a1", "a2", "a3"}, 5000, log_);
+        add(actions, a);
         add(actions, new RecordingAction("Z", {"zeta"}, 5001, log_));
         add(actions, new RecordingAction("Y", {"alpha"}, 5001, log_));
+        if (ghost_) actions["ghost"] = a;
     }
 
 private:
@@ -121,6 +124,7 @@ private:
         OrvRT::OrvNebu_ParamAction::addActionToHashMap(actions, action);
     }
     std::vector<std::string>& log_;
+    bool ghost_;
 };
 
 struct HostMap {
@@ -165,9 +169,9 @@ protected:
         OrvSim::takeStats(SESSION);
     }
 
-    RecordingSlave* registerRecordingSlave() {
+    RecordingSlave* registerRecordingSlave(bool ghost = false) {
         initialize(CTRL);  // finds the bus
-        auto* slave = new RecordingSlave(RECORDED, log_);
+        auto* slave = new RecordingSlave(RECORDED, log_, ghost);
         slave->init(SESSION, (dir_ / "regs.csv").string(), (dir_ / "params.csv").string());
         OrvRT::Orv_CoreList::addCore(SESSION, slave);
         OrvSim::takeStats(SESSION);
@@ -441,4 +445,20 @@ TEST_F(DefaultSlaveParams, AnEmptyRequestRunsAnActionOncePerName) {
     EXPECT_EQ((std::vector<Said>{
                   {256, "OrvNebu_getParameterChoices(): param 'a2' is not a choice parameter."}}),
               takeMessages());
+}
+
+TEST_F(DefaultSlaveParams, ANameMissingFromItsActionsListIsTakenOnce) {
+    // Without care the walk over requested names would take A again and again.
+    registerRecordingSlave(true);
+    Orv_HashMapCStr result = get(RECORDED, {{"ghost", ""}, {"a1", ""}});
+    EXPECT_EQ((std::vector<std::string>{"A:regs", "A:read"}), log_);
+    EXPECT_EQ("C", result.at("a1"));
+    log_.clear();
+    get(RECORDED, {{"ghost", ""}});
+    EXPECT_EQ((std::vector<std::string>{"A:regs", "A:read"}), log_);
+    log_.clear();
+    EXPECT_EQ(ORVNEBU_OK, set(RECORDED, {{"ghost", "x"}, {"a1", "4"}}));
+    EXPECT_EQ((std::vector<std::string>{"A:set"}), log_);
+    EXPECT_EQ(0x0004, word(2, 1));
+    EXPECT_TRUE(takeMessages().empty());
 }
