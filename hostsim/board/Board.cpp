@@ -37,8 +37,7 @@ const BoardChain* findChain(const Board::Impl& impl, uint32_t device, uint32_t c
     return it == chains.end() ? nullptr : &it->second;
 }
 
-const BoardCore* findCore(const Board::Impl& impl, uint32_t device, uint32_t chain,
-                          uint32_t core) {
+const BoardCore* findCore(const Board::Impl& impl, uint32_t device, uint32_t chain, uint32_t core) {
     const BoardChain* c = findChain(impl, device, chain);
     if (c == nullptr || core >= c->cores.size()) return nullptr;
     return &c->cores[core];
@@ -54,8 +53,8 @@ BusMaster& firstMaster(const Board::Impl& impl, uint32_t device, uint32_t chain)
             if (core.master) return *core.master;
         }
     }
-    throw std::out_of_range("device " + std::to_string(device) + " chain " +
-                            std::to_string(chain) + " has no bus master");
+    throw std::out_of_range("device " + std::to_string(device) + " chain " + std::to_string(chain) +
+                            " has no bus master");
 }
 
 }  // namespace
@@ -124,7 +123,8 @@ bool Board::coreStatus(uint32_t device, uint32_t chain, uint32_t core, uint32_t 
     if (c->hasRawStatus) {
         const size_t n = std::min(size, c->rawStatus.size());
         std::memcpy(bits, c->rawStatus.data(), n);
-        if (n == size && bitCount % 8 != 0) bits[n - 1] = uint8_t(bits[n - 1] & ((1u << (bitCount % 8)) - 1));
+        if (n == size && bitCount % 8 != 0)
+            bits[n - 1] = uint8_t(bits[n - 1] & ((1u << (bitCount % 8)) - 1));
         return true;
     }
     if (c->master) {

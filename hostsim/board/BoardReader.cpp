@@ -48,7 +48,8 @@ bool parseNumberText(const std::string& text, bool& negative, uint64_t& magnitud
         ++pos;
     }
     unsigned base = 10;
-    if (text.size() - pos > 2 && text[pos] == '0' && (text[pos + 1] == 'x' || text[pos + 1] == 'X')) {
+    if (text.size() - pos > 2 && text[pos] == '0' &&
+        (text[pos + 1] == 'x' || text[pos + 1] == 'X')) {
         base = 16;
         pos += 2;
     }
@@ -149,8 +150,9 @@ private:
             fail(path, "expected a number, got " + shown(value));
         }
         const bool inRange =
-            !overflow && (negative ? (r.lo < 0 && magnitude <= uint64_t(-r.lo))
-                                   : (magnitude <= r.hi && (r.lo <= 0 || magnitude >= uint64_t(r.lo))));
+            !overflow &&
+            (negative ? (r.lo < 0 && magnitude <= uint64_t(-r.lo))
+                      : (magnitude <= r.hi && (r.lo <= 0 || magnitude >= uint64_t(r.lo))));
         if (!inRange) fail(path, text + " is out of range " + rangeText(r));
         return negative ? -int64_t(magnitude) : int64_t(magnitude);
     }
@@ -167,7 +169,8 @@ private:
         bool overflow = false;
         uint64_t magnitude = 0;
         if (!parseNumberText(key, negative, magnitude, overflow) || negative) {
-            fail(path, std::string(what) + " \"" + key + "\" is not a decimal or 0x hexadecimal number");
+            fail(path,
+                 std::string(what) + " \"" + key + "\" is not a decimal or 0x hexadecimal number");
         }
         if (overflow || magnitude > hi) {
             fail(path, std::string(what) + " " + key + " is out of range " +
@@ -180,7 +183,8 @@ private:
         expectObject(value, path);
         checkKeys(value, path, {"trellom", "chains"});
         BoardDevice result;
-        if (value.contains("trellom")) result.trellom = flag(value.at("trellom"), at(path, "trellom"));
+        if (value.contains("trellom"))
+            result.trellom = flag(value.at("trellom"), at(path, "trellom"));
         if (!value.contains("chains")) return result;
         const json& chains = value.at("chains");
         const std::string chainsPath = at(path, "chains");
@@ -220,7 +224,8 @@ private:
             result.hasRawStatus = true;
             result.rawStatus = rawStatus(value.at("status"), at(path, "status"));
         }
-        if (value.contains("master")) result.master = master(value.at("master"), at(path, "master"));
+        if (value.contains("master"))
+            result.master = master(value.at("master"), at(path, "master"));
         return result;
     }
 
@@ -228,12 +233,14 @@ private:
     std::vector<uint8_t> rawStatus(const json& value, const std::string& path) const {
         std::vector<uint8_t> bytes;
         if (value.is_number_unsigned()) {
-            for (uint64_t v = value.get<uint64_t>(); v != 0; v >>= 8) bytes.push_back(uint8_t(v & 0xFFu));
+            for (uint64_t v = value.get<uint64_t>(); v != 0; v >>= 8)
+                bytes.push_back(uint8_t(v & 0xFFu));
             return bytes;
         }
         if (!value.is_string()) fail(path, "expected a hexadecimal text, got " + shown(value));
         std::string text = value.get<std::string>();
-        if (text.size() > 2 && text[0] == '0' && (text[1] == 'x' || text[1] == 'X')) text.erase(0, 2);
+        if (text.size() > 2 && text[0] == '0' && (text[1] == 'x' || text[1] == 'X'))
+            text.erase(0, 2);
         if (text.empty()) fail(path, shown(value) + " is not a hexadecimal number");
         size_t bit = 0;
         for (auto it = text.rbegin(); it != text.rend(); ++it, bit += 4) {
@@ -302,8 +309,8 @@ private:
 
     std::unique_ptr<BoardSlave> slave(const json& value, const std::string& path) const {
         static const char* const IDENT_KEYS[BusMaster::IDENT_COUNT] = {
-            "slaveType", "driverVersion", "coreType", "cgVersion",
-            "cgAlphaVersion", "edaVersion", "word6", "nextSlave"};
+            "slaveType",      "driverVersion", "coreType", "cgVersion",
+            "cgAlphaVersion", "edaVersion",    "word6",    "nextSlave"};
         expectObject(value, path);
         checkKeys(value, path,
                   {"slaveType", "driverVersion", "coreType", "cgVersion", "cgAlphaVersion",
@@ -312,7 +319,8 @@ private:
         for (uint32_t i = 0; i < BusMaster::IDENT_COUNT; ++i) {
             const char* key = IDENT_KEYS[i];
             if (value.contains(key)) {
-                result->ident[i] = uint16_t(unsignedNumber(value.at(key), at(path, key), U16_MAX, true));
+                result->ident[i] =
+                    uint16_t(unsignedNumber(value.at(key), at(path, key), U16_MAX, true));
             }
         }
         if (value.contains("faulty")) result->faulty = flag(value.at("faulty"), at(path, "faulty"));
@@ -368,7 +376,8 @@ std::unique_ptr<Board::Impl> readBoard(const std::string& text, const std::strin
         // Drop the library's "[json.exception.parse_error.N] " prefix.
         std::string what = e.what();
         const size_t end = what.find("] ");
-        if (what.rfind("[json.exception.", 0) == 0 && end != std::string::npos) what.erase(0, end + 2);
+        if (what.rfind("[json.exception.", 0) == 0 && end != std::string::npos)
+            what.erase(0, end + 2);
         throw BoardError(name + ": not valid JSON: " + what);
     }
     return Reader(name).board(root);

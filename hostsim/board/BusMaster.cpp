@@ -1,6 +1,8 @@
 // The NEBU bus master model: command decoding, handshakes, transfers and error bits.
 //
 // Choices where the board file contract is silent:
+// - Commands reach a core's master whatever the core's type; a core without a master ignores
+//   writes and reads zeros (Board::runCommand).
 // - A write whose bit count does not match its command (1: slaveCount + 2, 4: 29, 5: 19,
 //   7: 4 bits), a data command whose bit count fits neither the single nor the burst layout, a
 //   data command against the direction of the address word's write bit, a broadcast read and an

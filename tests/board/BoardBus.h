@@ -54,7 +54,8 @@ protected:
     }
 
     void write(uint32_t cmd, const std::vector<uint8_t>& bytes, uint32_t bitCount) {
-        ASSERT_TRUE(board->runCommand(DEV, CHAIN, masterCore, cmd, bytes.data(), nullptr, bitCount));
+        ASSERT_TRUE(
+            board->runCommand(DEV, CHAIN, masterCore, cmd, bytes.data(), nullptr, bitCount));
     }
     void write(uint32_t cmd, uint64_t value, uint32_t bitCount) {
         write(cmd, bitsOf(value, bitCount), bitCount);
@@ -62,12 +63,15 @@ protected:
     std::vector<uint8_t> readBytes(uint32_t cmd, uint32_t bitCount) {
         // One spare byte filled with a marker shows that nothing is written past the bits.
         std::vector<uint8_t> bytes((bitCount + 7) / 8 + 1, 0xA5);
-        EXPECT_TRUE(board->runCommand(DEV, CHAIN, masterCore, cmd, nullptr, bytes.data(), bitCount));
+        EXPECT_TRUE(
+            board->runCommand(DEV, CHAIN, masterCore, cmd, nullptr, bytes.data(), bitCount));
         EXPECT_EQ(bytes.back(), 0xA5) << "read wrote past its bits";
         bytes.pop_back();
         return bytes;
     }
-    uint64_t read(uint32_t cmd, uint32_t bitCount) { return valueOf(readBytes(cmd, bitCount), bitCount); }
+    uint64_t read(uint32_t cmd, uint32_t bitCount) {
+        return valueOf(readBytes(cmd, bitCount), bitCount);
+    }
 
     // The words of the plug-in's command primitives.
     void transferControl(uint32_t count, bool burst, bool incr, bool broadcast, uint32_t slave) {
@@ -76,7 +80,9 @@ protected:
                   (uint64_t(broadcast) << 19) | (uint64_t(slave & 0xFFu) << 20),
               29);
     }
-    void address(bool isWrite, uint32_t addr) { write(5, (addr & 0x1FFFFu) | (uint64_t(isWrite) << 17), 19); }
+    void address(bool isWrite, uint32_t addr) {
+        write(5, (addr & 0x1FFFFu) | (uint64_t(isWrite) << 17), 19);
+    }
 
     uint16_t singleRead(uint32_t slave, uint32_t addr) {
         transferControl(0, false, false, false, slave);
@@ -93,7 +99,8 @@ protected:
         address(false, addr);
         std::vector<uint8_t> bytes = readBytes(6, n * 16);
         std::vector<uint16_t> words;
-        for (uint32_t i = 0; i < n; ++i) words.push_back(uint16_t(bytes[2 * i] | (bytes[2 * i + 1] << 8)));
+        for (uint32_t i = 0; i < n; ++i)
+            words.push_back(uint16_t(bytes[2 * i] | (bytes[2 * i + 1] << 8)));
         return words;
     }
     void burstWrite(uint32_t slave, uint32_t addr, bool incr, const std::vector<uint16_t>& words,

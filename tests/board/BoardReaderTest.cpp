@@ -1,9 +1,9 @@
 // The board file reader: number forms, defaults, and one clear error per malformed file.
 #include <gtest/gtest.h>
+#include <unistd.h>
 
 #include <cstdio>
 #include <fstream>
-#include <unistd.h>
 
 #include "board/BoardBus.h"
 
@@ -44,13 +44,15 @@ TEST_F(BoardReaderTest, NumbersAsJsonNumbersOrDecimalOrHexText) {
     EXPECT_EQ(board->peek(DEV, CHAIN, 2, 0x1FFFF), 0xFFFF);
     EXPECT_EQ(busErrors(), 2u);
     busReset();
-    for (int i = 0; i < 20; ++i) ASSERT_EQ(masterStatus(), 0u) << "resetPolls \"-1\" never completes";
+    for (int i = 0; i < 20; ++i)
+        ASSERT_EQ(masterStatus(), 0u) << "resetPolls \"-1\" never completes";
 
     std::vector<uint8_t> bits(20);
     uint32_t info[5];
     ASSERT_TRUE(board->coreStatus(DEV, CHAIN, 1, info, bits.data(), 160));
-    EXPECT_EQ((boardtest::valueOf(std::vector<uint8_t>(bits.begin() + 8, bits.end()), 32) >> 4) & 0x3FF,
-              1000u);
+    EXPECT_EQ(
+        (boardtest::valueOf(std::vector<uint8_t>(bits.begin() + 8, bits.end()), 32) >> 4) & 0x3FF,
+        1000u);
 }
 
 TEST_F(BoardReaderTest, DefaultsOfAnEmptyMaster) {
@@ -88,11 +90,13 @@ TEST(BoardReaderErrors, MessagesNameTheFileThePlaceAndTheProblem) {
         {R"({"devices": [{}, {"colour": 1}]})",
          "boards/x.json: devices[1].colour: unknown key (known keys: trellom, chains)"},
         {R"({"devices": [{"chains": {"one": {}}}]})",
-         "boards/x.json: devices[0].chains.one: chain \"one\" is not a decimal or 0x hexadecimal number"},
+         "boards/x.json: devices[0].chains.one: chain \"one\" is not a decimal or 0x hexadecimal "
+         "number"},
         {R"({"devices": [{"chains": {"1": {}, "0x1": {}}}]})",
          "boards/x.json: devices[0].chains.1: chain 1 is given twice"},
         {R"({"devices": [{"chains": {"4294967296": {}}}]})",
-         "boards/x.json: devices[0].chains.4294967296: chain 4294967296 is out of range 0..4294967295"},
+         "boards/x.json: devices[0].chains.4294967296: chain 4294967296 is out of range "
+         "0..4294967295"},
         {R"({"devices": [{"chains": {"1": {"cores": {}}}}]})",
          "boards/x.json: devices[0].chains.1.cores: expected an array, got {}"},
         {R"({"devices": [{"chains": {"1": {"cores": [{"master": {}}]}}}]})",
@@ -105,9 +109,11 @@ TEST(BoardReaderErrors, MessagesNameTheFileThePlaceAndTheProblem) {
          "boards/x.json: devices[0].chains.1.cores[0].type: \"14 \" is not a decimal or 0x "
          "hexadecimal number"},
         {R"({"devices": [{"chains": {"1": {"cores": [{"type": 3, "status": "0xG1"}]}}}]})",
-         "boards/x.json: devices[0].chains.1.cores[0].status: \"0xG1\" is not a hexadecimal number"},
+         "boards/x.json: devices[0].chains.1.cores[0].status: \"0xG1\" is not a hexadecimal "
+         "number"},
         {R"({"devices": [{"chains": {"1": {"cores": [{"type": 3, "status": true}]}}}]})",
-         "boards/x.json: devices[0].chains.1.cores[0].status: expected a hexadecimal text, got true"},
+         "boards/x.json: devices[0].chains.1.cores[0].status: expected a hexadecimal text, got "
+         "true"},
         {withMaster(R"("slaveCount": 300)"), M + "slaveCount: 300 is out of range 0..255"},
         {withMaster(R"("slaveCount": "0x100")"), M + "slaveCount: 0x100 is out of range 0..255"},
         {withMaster(R"("slaveCount": "99999999999999999999999")"),
@@ -120,7 +126,8 @@ TEST(BoardReaderErrors, MessagesNameTheFileThePlaceAndTheProblem) {
         {withMaster(R"("slaves": [])"), M + "slaves: expected an object, got []"},
         {withMaster(R"("slaveCount": 2, "slaves": {"2": {}})"),
          M + "slaves.2: slave index 2 is not below slaveCount 2"},
-        {withMaster(R"("slaves": {"0": {}})"), M + "slaves.0: slave index 0 is not below slaveCount 0"},
+        {withMaster(R"("slaves": {"0": {}})"),
+         M + "slaves.0: slave index 0 is not below slaveCount 0"},
         {withMaster(R"("slaveCount": 2, "slaves": {"1": {}, "0x1": {}})"),
          M + "slaves.1: slave 1 is given twice"},
         {withMaster(R"("slaveCount": 1, "slaves": {"0": {"slaveType": 65536}})"),
@@ -148,7 +155,8 @@ TEST(BoardReaderErrors, MessagesNameTheFileThePlaceAndTheProblem) {
     for (const Case& c : cases) EXPECT_EQ(errorOf(c.json), c.message) << c.json;
 
     const std::string bad = errorOf("{\"devices\": [\n{,}]}", "broken.json");
-    EXPECT_EQ(bad.rfind("broken.json: not valid JSON: parse error at line 2, column 2", 0), 0u) << bad;
+    EXPECT_EQ(bad.rfind("broken.json: not valid JSON: parse error at line 2, column 2", 0), 0u)
+        << bad;
     EXPECT_EQ(errorOf("", "empty.json").rfind("empty.json: not valid JSON: ", 0), 0u);
 }
 

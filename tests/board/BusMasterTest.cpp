@@ -4,8 +4,8 @@
 
 #include "board/BoardBus.h"
 
-using boardtest::BoardBus;
 using boardtest::bitAt;
+using boardtest::BoardBus;
 using boardtest::valueOf;
 
 namespace {
@@ -22,48 +22,29 @@ const char* const FOUR_POSITIONS = R"(
 
 class BusMasterTest : public BoardBus {};
 
-TEST_F(BusMasterTest, SingleTransfersMoveSixteenBitWordsLeastSignificantBitFirst) {
+TEST_F(BusMasterTest, TransferWordsAndDataBitOrder) {
     loadMaster(FOUR_POSITIONS);
-    EXPECT_EQ(singleRead(0, 0x10), 0x1234);
-    EXPECT_EQ(singleRead(1, 0x10), 0x5678);
     EXPECT_EQ(singleRead(0, 0x22), 0x0003);
     EXPECT_EQ(singleRead(0, 0x99), 0x0000) << "absent addresses read 0";
 
-    // The read delivers exactly 16 bits: byte 0 holds bits 0..7 of the word.
-    transferControl(0, false, false, false, 0);
-    address(false, 0x10);
-    std::vector<uint8_t> bytes = readBytes(6, 16);
-    ASSERT_EQ(bytes.size(), 2u);
-    EXPECT_EQ(bytes[0], 0x34);
-    EXPECT_EQ(bytes[1], 0x12);
-
-    singleWrite(1, 0x1FFFF, 0xC0DE);
-    EXPECT_EQ(board->peek(DEV, CHAIN, 1, 0x1FFFF), 0xC0DE);
-    EXPECT_EQ(board->peek(DEV, CHAIN, 0, 0x1FFFF), 0) << "the write reached only slave 1";
-    EXPECT_EQ(board->lastTransferControl(DEV, CHAIN), 1u << 20);
-    EXPECT_EQ(board->lastAddressWord(DEV, CHAIN), 0x1FFFFu | (1u << 17));
-    EXPECT_EQ(busErrors(), 0u);
-}
-
-TEST_F(BusMasterTest, TransferControlFieldsSelectSlaveBurstIncrementAndBroadcast) {
-    loadMaster(FOUR_POSITIONS);
-    // Slave index from bits 20..27, count from bits 0..16: a burst of 2 from slave 1.
-    write(4, (2u) | (1u << 17) | (1u << 18) | (1u << 20), 29);
+    // Raw words: count bits 0..16, burst 17, increment 18, slave index 20..27; a read of
+    // 2 words delivers word 0 in bits 0..15, each least significant bit first.
+    write(4, 2u | (1u << 17) | (1u << 18) | (1u << 20), 29);
     write(5, 0x10, 19);
-    EXPECT_EQ(read(6, 32), 0x00005678u);
     board->poke(DEV, CHAIN, 1, 0x11, 0x4321);
-    EXPECT_EQ(read(6, 32), 0x43215678u);
-    EXPECT_EQ(busErrors(), 0u);
+    EXPECT_EQ(readBytes(6, 32), (std::vector<uint8_t>{0x78, 0x56, 0x21, 0x43}));
 
-    // The same burst without bit 18 reads one address twice.
-    write(4, (2u) | (1u << 17) | (1u << 20), 29);
-    EXPECT_EQ(read(6, 32), 0x56785678u);
-
-    // A write with bit 17 of the address word set stores; without it the same bits are a read.
+    // Address bit 17 makes a write; the two trailing data bits are not data.
     write(4, 0u, 29);
-    write(5, 0x30 | (1u << 17), 19);
-    write(6, 0x2BEEFu, 18);  // the two trailing bits are not data
-    EXPECT_EQ(board->peek(DEV, CHAIN, 0, 0x30), 0xBEEF);
+    write(5, 0x1FFFF | (1u << 17), 19);
+    write(6, 0x2BEEFu, 18);
+    EXPECT_EQ(board->peek(DEV, CHAIN, 0, 0x1FFFF), 0xBEEF);
+    EXPECT_EQ(board->peek(DEV, CHAIN, 1, 0x1FFFF), 0) << "the write reached only slave 0";
+    EXPECT_EQ(board->lastAddressWord(DEV, CHAIN), 0x1FFFFu | (1u << 17));
+    singleWrite(1, 0x10, 0xC0DE);
+    EXPECT_EQ(board->lastTransferControl(DEV, CHAIN), 1u << 20);
+    EXPECT_EQ(singleRead(1, 0x10), 0xC0DE);
+    EXPECT_EQ(busErrors(), 0u);
 }
 
 TEST_F(BusMasterTest, BurstsWithAndWithoutIncrementAndAddressWrap) {
@@ -106,49 +87,27 @@ TEST_F(BusMasterTest, BurstCountMismatchAndBadDataLayoutsSetBusErrorBitOne) {
     EXPECT_EQ(board->peek(DEV, CHAIN, 0, 0x301), 2);
     EXPECT_EQ(busErrors(), 2u);
 
-    // A single read of 17 bits fits no layout: ignored, zeros.
-    board->setBusErrorBits(DEV, CHAIN, 0);
+    // Each of these is ignored (a read gets zeros) and sets bit 1 alone.
+    auto flagged = [&](auto&& command) {
+        board->setBusErrorBits(DEV, CHAIN, 0);
+        command();
+        return busErrors();
+    };
     transferControl(0, false, false, false, 0);
     address(false, 0x10);
-    EXPECT_EQ(read(6, 17), 0u);
-    EXPECT_EQ(busErrors(), 2u);
-
-    // A single write of 16 bits (the trailing bits missing) is dropped.
-    board->setBusErrorBits(DEV, CHAIN, 0);
-    transferControl(0, false, false, false, 0);
+    EXPECT_EQ(flagged([&] { EXPECT_EQ(read(6, 17), 0u) << "fits no layout"; }), 2u);
+    EXPECT_EQ(flagged([&] { write(6, 0xFFFF, 18); }), 2u) << "a write against a read address";
     address(true, 0x10);
-    write(6, 0xFFFF, 16);
+    EXPECT_EQ(flagged([&] { write(6, 0xFFFF, 16); }), 2u) << "trailing bits missing";
+    EXPECT_EQ(flagged([&] { EXPECT_EQ(read(6, 16), 0u); }), 2u) << "a read against a write address";
     EXPECT_EQ(board->peek(DEV, CHAIN, 0, 0x10), 0x1234);
-    EXPECT_EQ(busErrors(), 2u);
-
-    // Data against the direction of the address word.
-    board->setBusErrorBits(DEV, CHAIN, 0);
-    address(false, 0x10);
-    write(6, 0xFFFF, 18);
-    EXPECT_EQ(board->peek(DEV, CHAIN, 0, 0x10), 0x1234);
-    EXPECT_EQ(busErrors(), 2u);
-    board->setBusErrorBits(DEV, CHAIN, 0);
-    address(true, 0x10);
-    EXPECT_EQ(read(6, 16), 0u);
-    EXPECT_EQ(busErrors(), 2u);
-
-    // Wrong widths of commands 4, 5 and 1, and an unknown command, are ignored.
-    board->setBusErrorBits(DEV, CHAIN, 0);
-    const uint32_t control = board->lastTransferControl(DEV, CHAIN);
-    write(4, 0x7, 28);
-    EXPECT_EQ(board->lastTransferControl(DEV, CHAIN), control);
-    EXPECT_EQ(busErrors(), 2u);
-    board->setBusErrorBits(DEV, CHAIN, 0);
-    write(5, 0x7, 20);
+    EXPECT_EQ(flagged([&] { write(4, 0x7, 28); }), 2u);
+    EXPECT_EQ(board->lastTransferControl(DEV, CHAIN), 0u);
+    EXPECT_EQ(flagged([&] { write(5, 0x7, 20); }), 2u);
     EXPECT_EQ(board->lastAddressWord(DEV, CHAIN), 0x10u | (1u << 17));
-    EXPECT_EQ(busErrors(), 2u);
-    board->setBusErrorBits(DEV, CHAIN, 0);
-    write(1, 0x3F, 7);
+    EXPECT_EQ(flagged([&] { write(1, 0x3F, 7); }), 2u);
     EXPECT_TRUE(board->lastResetControl(DEV, CHAIN).empty());
-    EXPECT_EQ(busErrors(), 2u);
-    board->setBusErrorBits(DEV, CHAIN, 0);
-    write(9, 1, 8);
-    EXPECT_EQ(busErrors(), 2u);
+    EXPECT_EQ(flagged([&] { write(9, 1, 8); }), 2u) << "unknown command";
 }
 
 TEST_F(BusMasterTest, EmptyPositionsReadZerosDropWritesAndSetBusErrorBitZero) {
