@@ -1,10 +1,10 @@
 // The board file reader: JSON text to devices, chains, cores, masters and slaves, with an
 // error naming the file, the place in the file and the problem for anything malformed.
-#include <cstring>
 #include <initializer_list>
 #include <limits>
 #include <nlohmann/json.hpp>
 #include <set>
+#include <type_traits>
 
 #include "hostsim/board/BoardImpl.h"
 
