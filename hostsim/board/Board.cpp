@@ -115,8 +115,10 @@ bool Board::coreStatus(uint32_t device, uint32_t chain, uint32_t core, uint32_t 
     std::lock_guard<std::mutex> lock(impl_->mutex);
     const BoardCore* c = findCore(*impl_, device, chain, core);
     if (c == nullptr) return false;
-    for (int i = 0; i < 5; ++i) info[i] = 0;
-    info[1] = c->type;
+    if (info != nullptr) {
+        for (int i = 0; i < 5; ++i) info[i] = 0;
+        info[1] = c->type;
+    }
     if (bits == nullptr) return true;
     const size_t size = bytesFor(bitCount);
     std::memset(bits, 0, size);
