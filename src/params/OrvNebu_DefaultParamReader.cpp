@@ -85,9 +85,12 @@ OrvNebu_DefaultParamReader::ChoiceActions* OrvNebu_DefaultParamReader::getFromSt
     return it->choiceActions.get();
 }
 
-void OrvNebu_DefaultParamReader::addToStorage(uint32_t handle, const std::string& fileName,
-                                              std::unique_ptr<ChoiceActions> actions) {
-    paramStorage().emplace(handle, fileName, std::move(actions), header_);
+OrvNebu_DefaultParamReader::ChoiceActions* OrvNebu_DefaultParamReader::addToStorage(
+    uint32_t handle, const std::string& fileName, std::unique_ptr<ChoiceActions> actions) {
+    // An entry already there keeps its actions (slaves may refer to them).
+    return paramStorage()
+        .emplace(handle, fileName, std::move(actions), header_)
+        .first->choiceActions.get();
 }
 
 bool OrvNebu_DefaultParamReader::parseLine(ChoiceActions* actions, uint32_t lineNumber,
@@ -118,7 +121,7 @@ bool OrvNebu_DefaultParamReader::parseLine(ChoiceActions* actions, uint32_t line
         const size_t eq = setting.find('=');
         if (setting.size() < 3 || eq == std::string::npos) return false;
         const std::string bits = setting.substr(eq + 1);
-        if (bits.size() > UINT32_MAX) return false;
+        if (static_cast<uint64_t>(bits.size()) > UINT32_MAX) return false;
         Orv_NumberUtil::binStr2HexStr(bits, value);
         action.addChoiceRegSetting(index, static_cast<uint32_t>(bits.size()), setting.substr(0, eq),
                                    value);
@@ -169,10 +172,7 @@ OrvNebu_DefaultParamReader::readParamsFromFile() {
 OrvNebu_DefaultParamReader::ChoiceActions* OrvNebu_DefaultParamReader::getParams() {
     ChoiceActions* cached = getFromStorage(handle_, fileName_);
     if (cached != nullptr) return cached;
-    std::unique_ptr<ChoiceActions> actions = readParamsFromFile();
-    ChoiceActions* result = actions.get();
-    addToStorage(handle_, fileName_, std::move(actions));
-    return result;
+    return addToStorage(handle_, fileName_, readParamsFromFile());
 }
 
 void OrvNebu_DefaultParamReader::addToHashMap(uint32_t handle, const std::string& paramFile,

@@ -80,8 +80,9 @@ private:
     static ParamStorage& paramStorage();
 
     ChoiceActions* getFromStorage(uint32_t handle, const std::string& fileName);
-    void addToStorage(uint32_t handle, const std::string& fileName,
-                      std::unique_ptr<ChoiceActions> actions);
+    // Returns the actions now cached under the key.
+    ChoiceActions* addToStorage(uint32_t handle, const std::string& fileName,
+                                std::unique_ptr<ChoiceActions> actions);
     bool parseLine(ChoiceActions* actions, uint32_t lineNumber, const std::string& line);
     std::unique_ptr<ChoiceActions> readParamsFromFile();
     ChoiceActions* getParams();
