@@ -52,13 +52,10 @@ uint32_t OrvCore_runCoreCommand(uint32_t handle, uint32_t device, uint32_t userC
     }
     session.sendQueued();
     const std::shared_ptr<OrvSim::Board> board = OrvSim::getBoard();
-    bool ok = false;
-    if (board != nullptr) {
-        ok = board->runCommand(device, userChain, coreIndex, cmd, nullptr, dataOut, bitCount);
-    } else {
-        // Nothing answers: the caller reads zeros.
-        std::memset(dataOut, 0, bitCount / 8u + (bitCount % 8u != 0 ? 1u : 0u));
-    }
+    const bool ok = board != nullptr &&
+                    board->runCommand(device, userChain, coreIndex, cmd, nullptr, dataOut, bitCount);
+    // Nothing answered: the caller reads zeros.
+    if (!ok) std::memset(dataOut, 0, bitCount / 8u + (bitCount % 8u != 0 ? 1u : 0u));
     session.readDone(command, dataOut);
     return ok ? RESULT_OK : RESULT_FAILED;
 }
