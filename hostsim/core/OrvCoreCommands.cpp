@@ -52,8 +52,8 @@ uint32_t OrvCore_runCoreCommand(uint32_t handle, uint32_t device, uint32_t userC
     }
     session.sendQueued();
     const std::shared_ptr<OrvSim::Board> board = OrvSim::getBoard();
-    const bool ok = board != nullptr &&
-                    board->runCommand(device, userChain, coreIndex, cmd, nullptr, dataOut, bitCount);
+    const bool ok = board != nullptr && board->runCommand(device, userChain, coreIndex, cmd,
+                                                          nullptr, dataOut, bitCount);
     // Nothing answered: the caller reads zeros.
     if (!ok) std::memset(dataOut, 0, bitCount / 8u + (bitCount % 8u != 0 ? 1u : 0u));
     session.readDone(command, dataOut);

@@ -19,9 +19,9 @@ void Orv_CoreComm::getCoreStatus(uint32_t handle, ORV_CORE_REF ref, ORV_CORE_INF
     const auto bits = static_cast<uint32_t>(bitCount < capacity ? bitCount : capacity);
     ORV_CORE_INFO filled{};
     const std::shared_ptr<OrvSim::Board> board = OrvSim::getBoard();
-    const bool found = board != nullptr && board->coreStatus(ref.device, ref.userChain,
-                                                             ref.coreIndex, filled.word,
-                                                             status.uPtr(), bits);
+    const bool found =
+        board != nullptr && board->coreStatus(ref.device, ref.userChain, ref.coreIndex, filled.word,
+                                              status.uPtr(), bits);
     session.coreStatusRead(ref.device, ref.userChain, ref.coreIndex, filled.word[1], found);
     if (!found) {
         throw std::logic_error("No core " + std::to_string(ref.coreIndex) + " on user chain " +

@@ -44,7 +44,9 @@ void traceCommand(const char* kind, const JtagCommand& command, const uint8_t* b
     traceLine(line);
 }
 
-size_t byteCount(uint32_t bitCount) { return static_cast<size_t>(bitCount / 8u + (bitCount % 8u != 0 ? 1u : 0u)); }
+size_t byteCount(uint32_t bitCount) {
+    return static_cast<size_t>(bitCount / 8u + (bitCount % 8u != 0 ? 1u : 0u));
+}
 
 }  // namespace
 
@@ -123,8 +125,8 @@ void JtagSession::coreStatusRead(uint32_t device, uint32_t chain, uint32_t core,
     ++stats_.statusReads;
     ++stats_.roundTrips;
     if (found && traceEnabled()) {
-        traceLine("jtag status device=" + std::to_string(device) + " chain=" +
-                  std::to_string(chain) + " core=" + std::to_string(core) +
+        traceLine("jtag status device=" + std::to_string(device) +
+                  " chain=" + std::to_string(chain) + " core=" + std::to_string(core) +
                   " type=" + std::to_string(type));
     }
 }

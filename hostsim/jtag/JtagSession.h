@@ -46,8 +46,7 @@ public:
     // After a read has returned its bits in data (call sendQueued before it): counts, traces.
     void readDone(const JtagCommand& command, const uint8_t* data);
     // A core status read; traced only when it found the core (type is its core type).
-    void coreStatusRead(uint32_t device, uint32_t chain, uint32_t core, uint32_t type,
-                        bool found);
+    void coreStatusRead(uint32_t device, uint32_t chain, uint32_t core, uint32_t type, bool found);
     // A core count read: counted, not traced.
     void coreCountRead();
 

@@ -1,5 +1,7 @@
 // The stand-in host's JTAG-session library: target lock, session messages, listeners, flush,
 // and the sinks and counters a host application reads.
+#include "host/OrvJtag.h"
+
 #include <algorithm>
 #include <atomic>
 #include <chrono>
@@ -8,7 +10,6 @@
 #include <string>
 #include <vector>
 
-#include "host/OrvJtag.h"
 #include "hostsim/Sim.h"
 #include "hostsim/jtag/JtagSession.h"
 
@@ -72,9 +73,7 @@ OrvJtagTargetLock::OrvJtagTargetLock(uint32_t handle, uint32_t timeout) : handle
     }
 }
 
-OrvJtagTargetLock::~OrvJtagTargetLock() {
-    OrvSim::JtagSession::get(handle_).targetLock().unlock();
-}
+OrvJtagTargetLock::~OrvJtagTargetLock() { OrvSim::JtagSession::get(handle_).targetLock().unlock(); }
 
 uint32_t addSessionMessageListener(SessionMessageListener* listener) {
     std::lock_guard<std::mutex> guard(OrvSim::listenerMutex);

@@ -2,6 +2,7 @@
 #include <algorithm>
 #include <limits>
 #include <stdexcept>
+#include <string>
 
 #include "host/OrvUtil.h"
 
@@ -29,7 +30,8 @@ std::pair<size_t, size_t> hexDigits(const std::string& text) {
     size_t end = text.size();
     while (begin < end && isBlank(text[begin])) ++begin;
     while (end > begin && isBlank(text[end - 1])) --end;
-    if (end - begin >= 2 && text[begin] == '0' && (text[begin + 1] == 'x' || text[begin + 1] == 'X')) {
+    if (end - begin >= 2 && text[begin] == '0' &&
+        (text[begin + 1] == 'x' || text[begin + 1] == 'X')) {
         begin += 2;
         if (begin == end) badHex(text);  // a prefix without digits
     }
@@ -108,6 +110,12 @@ std::string& Orv_NumberUtil::uInt2DecStr(uint32_t value, std::string& out) {
 
 std::string& Orv_NumberUtil::hexStr2BinStr(const std::string& hex, uint32_t width,
                                            std::string& out) {
+    // Far wider than any register a bus can hold; refused before a huge allocation.
+    constexpr uint32_t MAX_WIDTH = 1u << 24;
+    if (width > MAX_WIDTH) {
+        throw std::logic_error("Binary width " + std::to_string(width) + " for \"" + hex +
+                               "\" is larger than " + std::to_string(MAX_WIDTH) + " bits.");
+    }
     const auto [begin, end] = hexDigits(hex);
     // Built aside so that a failure leaves out untouched.
     std::string bits(width, '0');

@@ -41,6 +41,12 @@ std::shared_ptr<OrvSim::Board> TestHost::loadBoard(const std::string& json) {
     return board_;
 }
 
+std::shared_ptr<OrvSim::Board> TestHost::loadBoardFile(const std::string& path) {
+    board_ = OrvSim::Board::loadFile(path);
+    OrvSim::setBoard(board_);
+    return board_;
+}
+
 void TestHost::setDataDir(const std::string& dir) { OrvSim::setDataDir(dir); }
 
 std::vector<TestHost::Message> TestHost::messages() const {
@@ -79,8 +85,8 @@ std::string describe(const std::vector<TestHost::Message>& messages) {
     for (const auto& m : all) {
         if (m.severity == severity && m.text == text) return ::testing::AssertionSuccess();
     }
-    return ::testing::AssertionFailure() << "no message " << severity << ": \"" << text
-                                         << "\" among " << describe(all);
+    return ::testing::AssertionFailure()
+           << "no message " << severity << ": \"" << text << "\" among " << describe(all);
 }
 
 ::testing::AssertionResult TestHost::lastMessageIs(uint32_t severity,
@@ -89,8 +95,8 @@ std::string describe(const std::vector<TestHost::Message>& messages) {
     if (!all.empty() && all.back().severity == severity && all.back().text == text) {
         return ::testing::AssertionSuccess();
     }
-    return ::testing::AssertionFailure() << "last message is not " << severity << ": \"" << text
-                                         << "\"; " << describe(all);
+    return ::testing::AssertionFailure()
+           << "last message is not " << severity << ": \"" << text << "\"; " << describe(all);
 }
 
 ::testing::AssertionResult TestHost::noMessages() const {

@@ -41,6 +41,8 @@ protected:
 
     // Loads the board (Board::loadText) and puts it behind every session. Throws BoardError.
     std::shared_ptr<OrvSim::Board> loadBoard(const std::string& json);
+    // The same from a file (Board::loadFile), e.g. NEBU_TEST_BOARDS_DIR "/demo.json".
+    std::shared_ptr<OrvSim::Board> loadBoardFile(const std::string& path);
     std::shared_ptr<OrvSim::Board> board() const { return board_; }
     // Defaults to NEBU_TEST_DATA_DIR.
     void setDataDir(const std::string& dir);

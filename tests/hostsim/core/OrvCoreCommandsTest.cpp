@@ -26,13 +26,13 @@ protected:
         const uint8_t bytes[4] = {static_cast<uint8_t>(value), static_cast<uint8_t>(value >> 8),
                                   static_cast<uint8_t>(value >> 16),
                                   static_cast<uint8_t>(value >> 24)};
-        return OrvCore_runCoreCommand(handle, DEVICE, CHAIN, MASTER, cmd, bytes, nullptr,
-                                      bitCount, 0);
+        return OrvCore_runCoreCommand(handle, DEVICE, CHAIN, MASTER, cmd, bytes, nullptr, bitCount,
+                                      0);
     }
     uint32_t read(uint32_t cmd, uint32_t bitCount, uint32_t handle = HANDLE) {
         uint8_t bytes[4] = {0xEE, 0xEE, 0xEE, 0xEE};
-        const uint32_t rc = OrvCore_runCoreCommand(handle, DEVICE, CHAIN, MASTER, cmd, nullptr,
-                                                   bytes, bitCount, 0);
+        const uint32_t rc =
+            OrvCore_runCoreCommand(handle, DEVICE, CHAIN, MASTER, cmd, nullptr, bytes, bitCount, 0);
         EXPECT_EQ(rc, 0u);
         uint32_t value = 0;
         for (uint32_t i = 0; i < 4; ++i) {
@@ -180,7 +180,8 @@ TEST_F(OrvCoreCommandsTest, TheEndOfASessionSendsItsQueuedWrites) {
 TEST_F(OrvCoreCommandsTest, ABadDirectionIsRefusedAndNothingIsQueued) {
     stats();
     uint8_t bytes[4] = {};
-    EXPECT_NE(OrvCore_runCoreCommand(HANDLE, DEVICE, CHAIN, MASTER, 6, nullptr, nullptr, 16, 0), 0u);
+    EXPECT_NE(OrvCore_runCoreCommand(HANDLE, DEVICE, CHAIN, MASTER, 6, nullptr, nullptr, 16, 0),
+              0u);
     EXPECT_NE(OrvCore_runCoreCommand(HANDLE, DEVICE, CHAIN, MASTER, 6, bytes, bytes, 16, 0), 0u);
     EXPECT_EQ(stats().commands, 0u);
     // A read from a core that does not exist fails and reads zeros.

@@ -119,8 +119,8 @@ TEST_F(Orv_CoreListTest, GetSlavesAppendsTheBusSlavesOfOneBusByIndex) {
     Orv_CoreList::addCore(HANDLE, s0);
     Orv_CoreList::addCore(HANDLE, hostCore);
     Orv_CoreList::addCore(HANDLE, s2);
-    Orv_CoreList::addCore(HANDLE, core(0, 2, 1));  // another bus
-    Orv_CoreList::addCore(HANDLE, core(1, 1, 1));  // another device
+    Orv_CoreList::addCore(HANDLE, core(0, 2, 1));                        // another bus
+    Orv_CoreList::addCore(HANDLE, core(1, 1, 1));                        // another device
     Orv_CoreList::addCore(HANDLE + 1, core(0, 1, 4, true, HANDLE + 1));  // another session
 
     std::vector<Orv_Core*> found{nullptr};

@@ -18,14 +18,15 @@ class OrvJtagTest : public TestHost {};
 
 // Tries the lock of handle from another thread; the text of the failure, or "" when taken.
 std::string lockFromOtherThread(uint32_t handle, uint32_t timeout) {
-    return std::async(std::launch::async, [=] {
-               try {
-                   OrvJtagTargetLock lock(handle, timeout);
-                   return std::string();
-               } catch (const std::runtime_error& e) {
-                   return std::string(e.what());
-               }
-           })
+    return std::async(std::launch::async,
+                      [=] {
+                          try {
+                              OrvJtagTargetLock lock(handle, timeout);
+                              return std::string();
+                          } catch (const std::runtime_error& e) {
+                              return std::string(e.what());
+                          }
+                      })
         .get();
 }
 
@@ -111,7 +112,8 @@ TEST_F(OrvJtagTest, ListenersHearOfTheEndBeforeTheCoresGo) {
     auto* listener = new RecordingListener();
     OrvRT::addSessionMessageListener(listener);
     ORV_CORE_REF ref{0, 1, 2};
-    OrvRT::Orv_CoreList::addCore(HANDLE, new OrvRT::Orv_Core(HANDLE, ref, ORV_CORE_INFO{}, nullptr, 0));
+    OrvRT::Orv_CoreList::addCore(HANDLE,
+                                 new OrvRT::Orv_Core(HANDLE, ref, ORV_CORE_INFO{}, nullptr, 0));
     OrvSim::endSession(HANDLE);
     EXPECT_TRUE(listener->coreSeen);
     EXPECT_EQ(OrvRT::Orv_CoreList::getSlave(HANDLE, &listener->ref), nullptr);
@@ -123,8 +125,10 @@ TEST_F(OrvJtagTest, AFreshHostEndsEverySessionButKeepsItsListeners) {
     OrvJtag_target_flush(11);
     OrvJtag_target_flush(12);
     OrvSim::resetHost();
-    EXPECT_NE(std::find(listener->ended.begin(), listener->ended.end(), 11u), listener->ended.end());
-    EXPECT_NE(std::find(listener->ended.begin(), listener->ended.end(), 12u), listener->ended.end());
+    EXPECT_NE(std::find(listener->ended.begin(), listener->ended.end(), 11u),
+              listener->ended.end());
+    EXPECT_NE(std::find(listener->ended.begin(), listener->ended.end(), 12u),
+              listener->ended.end());
     EXPECT_EQ(OrvRT::addSessionMessageListener(listener), count);
     EXPECT_EQ(OrvSim::takeStats(11).flushes, 0u);
     // The sinks are gone too.

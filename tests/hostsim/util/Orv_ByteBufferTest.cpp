@@ -58,7 +58,8 @@ TEST(Orv_ByteBufferTest, GetBitsReadsWholeSixtyFourBitFieldsAtAnyOffset) {
         for (uint32_t k = 0; k < 64; ++k) {
             if ((value >> k) & 1u) {
                 const uint32_t bit = first + k;
-                buffer.uPtr()[bit / 8] = static_cast<uint8_t>(buffer.uPtr()[bit / 8] | (1u << (bit % 8)));
+                buffer.uPtr()[bit / 8] =
+                    static_cast<uint8_t>(buffer.uPtr()[bit / 8] | (1u << (bit % 8)));
             }
         }
         EXPECT_EQ(buffer.getBits(first, 64), value) << first;

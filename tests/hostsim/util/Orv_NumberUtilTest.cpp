@@ -87,8 +87,8 @@ TEST(Orv_NumberUtilTest, HexToBinaryGivesExactlyTheWidthAtAnyWidth) {
     EXPECT_EQ(&Orv_NumberUtil::hexStr2BinStr("5", 0, out), &out);
     EXPECT_EQ(out, "");
     EXPECT_EQ(Orv_NumberUtil::hexStr2BinStr("1", 1, out), "1");
-    EXPECT_EQ(Orv_NumberUtil::hexStr2BinStr("2", 1, out), "0");  // cut to the low bit
-    EXPECT_EQ(Orv_NumberUtil::hexStr2BinStr("A", 8, out), "00001010");  // padded
+    EXPECT_EQ(Orv_NumberUtil::hexStr2BinStr("2", 1, out), "0");           // cut to the low bit
+    EXPECT_EQ(Orv_NumberUtil::hexStr2BinStr("A", 8, out), "00001010");    // padded
     EXPECT_EQ(Orv_NumberUtil::hexStr2BinStr("ABC", 8, out), "10111100");  // cut
     EXPECT_EQ(Orv_NumberUtil::hexStr2BinStr("ab", 8, out), "10101011");
     EXPECT_EQ(Orv_NumberUtil::hexStr2BinStr("AB", 8, out), "10101011");
@@ -113,6 +113,11 @@ TEST(Orv_NumberUtilTest, HexToBinaryRejectsBadTextAndLeavesTheOutput) {
         EXPECT_NE(what.find(std::string("\"") + bad + "\""), std::string::npos) << what;
         EXPECT_EQ(out, "kept");
     }
+    // An absurd width is refused instead of allocating gigabytes.
+    const std::string what =
+        logicErrorOf([&] { Orv_NumberUtil::hexStr2BinStr("1", UINT32_MAX, out); });
+    EXPECT_NE(what.find("4294967295"), std::string::npos) << what;
+    EXPECT_EQ(out, "kept");
 }
 
 TEST(Orv_NumberUtilTest, BinaryToHexPadsToTheFullWidthAtAnyWidth) {

@@ -44,7 +44,8 @@ TEST(Orv_UtilTest, TrimAndStripTouchOnlyTheirCharacters) {
 TEST(Orv_UtilTest, UnQuoteRemovesOnePairOfSurroundingQuotes) {
     std::vector<std::string> fields{"\"a\"", "\"", "\"\"", "b\"", "\"x", "\"\"a\"\"", "plain", ""};
     Orv_Util::unQuote(fields);
-    EXPECT_EQ(fields, (std::vector<std::string>{"a", "\"", "", "b\"", "\"x", "\"a\"", "plain", ""}));
+    EXPECT_EQ(fields,
+              (std::vector<std::string>{"a", "\"", "", "b\"", "\"x", "\"a\"", "plain", ""}));
 }
 
 class DataDirTest : public TestHost {};
