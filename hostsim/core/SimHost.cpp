@@ -13,22 +13,26 @@ namespace OrvSim {
 
 namespace {
 std::mutex boardMutex;
-std::shared_ptr<Board> currentBoard;
+// Never destroyed: plug-in code may still reach the host while the process ends.
+std::shared_ptr<Board>& currentBoard() {
+    static auto* board = new std::shared_ptr<Board>();
+    return *board;
+}
 }  // namespace
 
 void setBoard(std::shared_ptr<Board> board) {
     std::shared_ptr<Board> old;
     {
         std::lock_guard<std::mutex> guard(boardMutex);
-        old = std::move(currentBoard);
-        currentBoard = std::move(board);
+        old = std::move(currentBoard());
+        currentBoard() = std::move(board);
     }
     // The old board goes away outside the lock.
 }
 
 std::shared_ptr<Board> getBoard() {
     std::lock_guard<std::mutex> guard(boardMutex);
-    return currentBoard;
+    return currentBoard();
 }
 
 void endSession(uint32_t handle) {

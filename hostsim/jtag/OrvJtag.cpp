@@ -18,9 +18,17 @@ namespace OrvSim {
 namespace {
 
 std::mutex sinkMutex;
-MessageSink messageSink;
-TraceSink traceSink;
 std::atomic<bool> tracing{false};
+
+// Never destroyed: a plug-in's static destructors may still send messages at exit.
+MessageSink& messageSink() {
+    static auto* sink = new MessageSink();
+    return *sink;
+}
+TraceSink& traceSink() {
+    static auto* sink = new TraceSink();
+    return *sink;
+}
 
 std::mutex listenerMutex;
 std::vector<OrvRT::SessionMessageListener*>& listeners() {
@@ -33,13 +41,13 @@ std::vector<OrvRT::SessionMessageListener*>& listeners() {
 
 void setMessageSink(MessageSink sink) {
     std::lock_guard<std::mutex> guard(sinkMutex);
-    messageSink = std::move(sink);
+    messageSink() = std::move(sink);
 }
 
 void setTraceSink(TraceSink sink) {
     std::lock_guard<std::mutex> guard(sinkMutex);
     tracing.store(static_cast<bool>(sink), std::memory_order_relaxed);
-    traceSink = std::move(sink);
+    traceSink() = std::move(sink);
 }
 
 bool traceEnabled() { return tracing.load(std::memory_order_relaxed); }
@@ -48,7 +56,7 @@ void traceLine(const std::string& line) {
     TraceSink sink;
     {
         std::lock_guard<std::mutex> guard(sinkMutex);
-        sink = traceSink;
+        sink = traceSink();
     }
     if (sink) sink(line);
 }
@@ -92,7 +100,7 @@ void OrvJtag_session_sendMessage(uint32_t handle, uint32_t severity, const char*
     OrvSim::MessageSink sink;
     {
         std::lock_guard<std::mutex> guard(OrvSim::sinkMutex);
-        sink = OrvSim::messageSink;
+        sink = OrvSim::messageSink();
     }
     if (sink) sink(handle, severity, text != nullptr ? std::string(text) : std::string());
 }

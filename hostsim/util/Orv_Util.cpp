@@ -12,7 +12,11 @@ namespace OrvRT {
 namespace {
 
 std::mutex dataDirMutex;
-std::string dataDir;  // empty: never set
+// Empty: never set. Never destroyed, like the host's other process-wide state.
+std::string& dataDir() {
+    static auto* dir = new std::string();
+    return *dir;
+}
 
 int lowerChar(char c) { return std::tolower(static_cast<unsigned char>(c)); }
 
@@ -60,7 +64,7 @@ void Orv_Util::unQuote(std::vector<std::string>& fields) {
 
 std::string Orv_Util::getVanduDataDirPath() {
     std::lock_guard<std::mutex> guard(dataDirMutex);
-    return dataDir.empty() ? std::string("./") : dataDir;
+    return dataDir().empty() ? std::string("./") : dataDir();
 }
 
 }  // namespace OrvRT
@@ -71,7 +75,7 @@ void setDataDir(const std::string& dir) {
     std::string path = dir;
     if (!path.empty() && path.back() != '/' && path.back() != '\\') path += '/';
     std::lock_guard<std::mutex> guard(OrvRT::dataDirMutex);
-    OrvRT::dataDir = path;
+    OrvRT::dataDir() = path;
 }
 
 }  // namespace OrvSim
