@@ -131,7 +131,7 @@ std::vector<std::string> TestHost::traceStartingWith(const std::string& prefix) 
 }
 
 ORV_HASHMAP_HANDLE TestHost::makeMap(
-    std::initializer_list<std::pair<const char*, const char*>> entries) {
+    std::initializer_list<std::pair<std::string, std::string>> entries) {
     ORV_HASHMAP_HANDLE map = OrvContainer_hashmapCStr_new();
     maps_.push_back(map);
     for (const auto& entry : entries) mapOf(map)[entry.first] = entry.second;

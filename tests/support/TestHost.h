@@ -67,7 +67,7 @@ protected:
 
     // A host map made with OrvContainer_hashmapCStr_new and filled; freed in TearDown.
     ORV_HASHMAP_HANDLE makeMap(
-        std::initializer_list<std::pair<const char*, const char*>> entries = {});
+        std::initializer_list<std::pair<std::string, std::string>> entries = {});
     static OrvRT::Orv_HashMapCStr& mapOf(ORV_HASHMAP_HANDLE map) {
         return *static_cast<OrvRT::Orv_HashMapCStr*>(map);
     }
