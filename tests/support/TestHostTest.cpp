@@ -32,4 +32,15 @@ TEST_F(TestHostTest, MessageChecksMatchSeverityAndExactText) {
     EXPECT_NO_MESSAGES();
 }
 
+TEST_F(TestHostTest, BoardsComeFromTextOrFileAndStandBehindEverySession) {
+    loadBoardFile(NEBU_TEST_BOARDS_DIR "/demo.json");
+    uint32_t count = 0;
+    ASSERT_EQ(OrvCore_getCoreCount(HANDLE, 0, 1, &count), 0);
+    EXPECT_EQ(count, 2u);
+    loadBoard(BUS_BOARD);
+    EXPECT_EQ(OrvSim::getBoard(), board());
+    EXPECT_EQ(board()->peek(0, 1, 1, 0x10), 0x1234u);
+    EXPECT_THROW(loadBoard("{ \"devices\": 3 }"), OrvSim::BoardError);
+}
+
 }  // namespace
