@@ -127,16 +127,6 @@ private:
     bool ghost_;
 };
 
-struct HostMap {
-    explicit HostMap(const Orv_HashMapCStr& init = Orv_HashMapCStr())
-        : handle(OrvContainer_hashmapCStr_new()) {
-        map() = init;
-    }
-    ~HostMap() { OrvContainer_hashmapCStr_delete(handle); }
-    Orv_HashMapCStr& map() { return *static_cast<Orv_HashMapCStr*>(handle); }
-    ORV_HASHMAP_HANDLE handle;
-};
-
 class DefaultSlaveParams : public TestHost {
 protected:
     void SetUp() override {
@@ -178,24 +168,30 @@ protected:
         return slave;
     }
 
+    ORV_HASHMAP_HANDLE hostMap(const Orv_HashMapCStr& entries) {
+        ORV_HASHMAP_HANDLE map = makeMap();
+        mapOf(map) = entries;
+        return map;
+    }
+
     Orv_HashMapCStr get(const ORV_SLAVE_REF& ref, const Orv_HashMapCStr& request,
                         uint32_t rc = ORVNEBU_OK) {
-        HostMap params(request);
-        EXPECT_EQ(rc, OrvNebu_getParameters(SESSION, ref, &params.handle));
-        return params.map();
+        ORV_HASHMAP_HANDLE params = hostMap(request);
+        EXPECT_EQ(rc, OrvNebu_getParameters(SESSION, ref, &params));
+        return mapOf(params);
     }
 
     uint32_t set(const ORV_SLAVE_REF& ref, const Orv_HashMapCStr& request) {
-        HostMap params(request);
-        return OrvNebu_setParameters(SESSION, ref, &params.handle);
+        ORV_HASHMAP_HANDLE params = hostMap(request);
+        return OrvNebu_setParameters(SESSION, ref, &params);
     }
 
     std::vector<std::string> choices(const ORV_SLAVE_REF& ref, const Orv_HashMapCStr& request,
                                      uint32_t rc = ORVNEBU_OK) {
-        HostMap params(request);
+        ORV_HASHMAP_HANDLE params = hostMap(request);
         std::vector<std::string> list{"stale"};
         void* listHandle = &list;
-        EXPECT_EQ(rc, OrvNebu_getParameterChoices(SESSION, ref, &params.handle, &listHandle));
+        EXPECT_EQ(rc, OrvNebu_getParameterChoices(SESSION, ref, &params, &listHandle));
         return list;
     }
 
@@ -321,7 +317,7 @@ TEST_F(DefaultSlaveParams, Choices) {
 
 TEST_F(DefaultSlaveParams, ArgumentChecksComeAfterTheSlave) {
     initialize(CTRL);
-    HostMap params(Orv_HashMapCStr{{"MODE", ""}});
+    ORV_HASHMAP_HANDLE params = makeMap({{"MODE", ""}});
     ORV_HASHMAP_HANDLE nullHandle = nullptr;
     std::vector<std::string> list;
     void* listHandle = &list;
@@ -329,8 +325,8 @@ TEST_F(DefaultSlaveParams, ArgumentChecksComeAfterTheSlave) {
     EXPECT_EQ(FAILED, OrvNebu_getParameters(SESSION, CTRL, nullptr));
     EXPECT_EQ(FAILED, OrvNebu_getParameters(SESSION, CTRL, &nullHandle));
     EXPECT_EQ(FAILED, OrvNebu_setParameters(SESSION, CTRL, nullptr));
-    EXPECT_EQ(FAILED, OrvNebu_getParameterChoices(SESSION, CTRL, &params.handle, nullptr));
-    EXPECT_EQ(FAILED, OrvNebu_getParameterChoices(SESSION, CTRL, &params.handle, &nullList));
+    EXPECT_EQ(FAILED, OrvNebu_getParameterChoices(SESSION, CTRL, &params, nullptr));
+    EXPECT_EQ(FAILED, OrvNebu_getParameterChoices(SESSION, CTRL, &params, &nullList));
     EXPECT_EQ(FAILED, OrvNebu_getParameterChoices(SESSION, CTRL, &nullHandle, &listHandle));
     const std::string choicesCheck =
         "OrvNebu_getParameterChoices() argument checking failed:(params != 0) && (choices != 0)";
