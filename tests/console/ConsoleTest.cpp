@@ -421,6 +421,20 @@ TEST_F(ConsoleTest, ScanWalksEveryChainOfTheBoard) {
     EXPECT_EQ(status(), 1);
 }
 
+TEST_F(ConsoleTest, QuitEndsTheStream) {
+    std::istringstream in("getSlaveCount 0 1\n  quit  # done\ngetSlaveCount 0 2\n");
+    console_->runStream(in, false);
+    EXPECT_EQ(out_.str(), "> getSlaveCount 0 1\nrc=0x00000000\ncount=2\n>   quit  # done\n");
+    EXPECT_EQ(g_calls, (std::vector<std::string>{"h1 getSlaveCount 0,1"}));
+    EXPECT_TRUE(console_->quitRequested());
+}
+
+TEST_F(ConsoleTest, PromptOnlyWhenAsked) {
+    std::istringstream in("getSlaveCount 0 1\n");
+    console_->runStream(in, true);
+    EXPECT_EQ(out_.str(), "nebu> > getSlaveCount 0 1\nrc=0x00000000\ncount=2\nnebu> \n");
+}
+
 TEST_F(ConsoleTest, HelpMarksWhatThePluginLacks) {
     const std::string out = run({"help"});
     EXPECT_NE(out.find("\n  singleSlaveRead D C S ADDRESS "), std::string::npos);

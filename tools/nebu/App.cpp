@@ -74,7 +74,10 @@ int runNebu(int argc, char** argv, std::istream& in, std::ostream& out, std::ost
         console.installSinks(options.trace);
         if (scriptFile.is_open()) console.runStream(scriptFile, false);
         if (scriptFromStdin) console.runStream(in, false);
-        for (const auto& command : options.commands) console.runLine(command);
+        for (const auto& command : options.commands) {
+            if (console.quitRequested()) break;
+            console.runLine(command);
+        }
         if (options.script.empty() && options.commands.empty()) {
             console.runStream(in, inIsTerminal);
         }

@@ -92,6 +92,8 @@ const std::vector<Console::Command>& Console::commands() {
         {"printParameterFile", "PATH", 1, 1, {}, &Console::cmdPrintParameterFile,
          "print a parameter definition file as read"},
         {"help", "", 0, 0, {}, &Console::cmdHelp, "this list"},
+        {"quit", "", 0, 0, {}, &Console::cmdQuit, "read no more commands (also: exit)"},
+        {"exit", "", 0, 0, {}, &Console::cmdQuit, "read no more commands"},
     };
     return table;
 }
@@ -204,12 +206,12 @@ void Console::runLine(const std::string& line) {
 
 void Console::runStream(std::istream& in, bool prompt) {
     std::string line;
-    for (;;) {
+    while (!quit_) {
         if (prompt) out_ << "nebu> " << std::flush;
         if (!std::getline(in, line)) break;
         runLine(line);
     }
-    if (prompt) out_ << '\n' << std::flush;
+    if (prompt && !quit_) out_ << '\n' << std::flush;
 }
 
 void Console::finish() {

@@ -32,7 +32,7 @@ public:
     void installSinks(bool trace);
     // Skips an empty or comment line; otherwise echoes it, runs it and prints its outputs.
     void runLine(const std::string& line);
-    // Runs every line of in; with prompt, shows "nebu> " before each.
+    // Runs every line of in until its end or quit; with prompt, shows "nebu> " before each.
     void runStream(std::istream& in, bool prompt);
     // Removes the sinks and ends every session the console used, so that the slave objects
     // are gone while the plug-in is still loaded.
@@ -41,6 +41,8 @@ public:
     // 2 after a usage error, else 1 after a failed exported call, else 0.
     int exitStatus() const;
     uint32_t session() const { return session_; }
+    // After quit or exit: the program reads no more commands.
+    bool quitRequested() const { return quit_; }
 
 private:
     using Words = std::vector<std::string>;
@@ -112,6 +114,7 @@ private:
     void cmdPrintRegisterFile(const Words& args);
     void cmdPrintParameterFile(const Words& args);
     void cmdHelp(const Words& args);
+    void cmdQuit(const Words& args);
 
     PluginApi api_;
     std::ostream& out_;
@@ -121,6 +124,7 @@ private:
     bool failed_ = false;
     bool usageFailed_ = false;
     bool sinksInstalled_ = false;
+    bool quit_ = false;
     std::set<uint32_t> sessionsUsed_;
     std::set<RefKey> initialized_;  // slave objects this console made and has not removed
 };

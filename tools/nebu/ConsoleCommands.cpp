@@ -194,10 +194,13 @@ void Console::cmdPrintParameterFile(const Words& args) {
     if (status == 1) failed_ = true;
 }
 
+void Console::cmdQuit(const Words&) { quit_ = true; }
+
 void Console::cmdHelp(const Words&) {
     print("Commands (D C S: device, user chain, slave index; numbers decimal or 0x hex;");
     print("maps as NAME or NAME=VALUE; \"quotes\" keep blanks and commas; # starts a comment):");
     for (const auto& c : commands()) {
+        if (c.run == &Console::cmdQuit && std::string(c.name) == "exit") continue;
         std::string synopsis = std::string("  ") + c.name;
         if (*c.args != '\0') synopsis += std::string(" ") + c.args;
         if (synopsis.size() < 52) synopsis.resize(52, ' ');
