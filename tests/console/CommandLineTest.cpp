@@ -1,8 +1,7 @@
 // Reading console command lines: words, quotes, comments, numbers and map entries.
-#include "CommandLine.h"
-
 #include <gtest/gtest.h>
 
+#include "CommandLine.h"
 #include "UsageError.h"
 
 namespace nebu {

@@ -1,7 +1,5 @@
 // The console's interpreter driven line by line against a stand-in plug-in whose functions
 // record how they were called and answer with known outputs, messages and return codes.
-#include "Console.h"
-
 #include <gtest/gtest.h>
 
 #include <algorithm>
@@ -11,6 +9,7 @@
 #include <string>
 #include <vector>
 
+#include "Console.h"
 #include "host/OrvJtag.h"
 #include "hostsim/Sim.h"
 #include "hostsim/board/Board.h"
@@ -112,13 +111,13 @@ uint32_t fakeGetParameterChoices(uint32_t h, ORV_SLAVE_REF r, ORV_HASHMAP_HANDLE
 uint32_t fakeRead(uint32_t h, ORV_SLAVE_REF r, uint32_t address, uint32_t size, char* data) {
     record(h, "read " + refText(r) + " " + std::to_string(address) + " " + std::to_string(size));
     if (size == 0) return ORVNEBU_FAILED;
-    for (uint32_t i = 0; i < size; ++i) std::snprintf(data + 4 * i, 5, "%04X", (size - i) & 0xFFFFu);
+    for (uint32_t i = 0; i < size; ++i)
+        std::snprintf(data + 4 * i, 5, "%04X", (size - i) & 0xFFFFu);
     return g_rc;
 }
-uint32_t fakeWrite(uint32_t h, ORV_SLAVE_REF r, uint32_t address, uint32_t size,
-                   const char* data) {
-    record(h, "write " + refText(r) + " " + std::to_string(address) + " " +
-                  std::to_string(size) + " " + data);
+uint32_t fakeWrite(uint32_t h, ORV_SLAVE_REF r, uint32_t address, uint32_t size, const char* data) {
+    record(h, "write " + refText(r) + " " + std::to_string(address) + " " + std::to_string(size) +
+                  " " + data);
     return g_rc;
 }
 uint32_t fakeGetBusErrorStatus(uint32_t h, uint32_t d, uint32_t c, uint32_t* status, uint32_t n) {
@@ -176,8 +175,7 @@ uint32_t fakeBurstSlaveWrite(uint32_t h, ORV_SLAVE_REF r, uint32_t address, uint
 uint32_t fakeBroadcastSingleWrite(uint32_t h, uint32_t d, uint32_t c, uint32_t address,
                                   uint32_t value, uint32_t* status) {
     record(h, "broadcastSingleWrite " + std::to_string(d) + "," + std::to_string(c) + " " +
-                  std::to_string(address) + " " + std::to_string(value) + " status " +
-                  ptr(status));
+                  std::to_string(address) + " " + std::to_string(value) + " status " + ptr(status));
     if (status != nullptr) *status = 0;
     return g_rc;
 }
@@ -270,10 +268,10 @@ TEST_F(ConsoleTest, ZeroCountsPassNullArrays) {
               "> getBusErrorStatus 0 1 0\nrc=0x80000000\nerrorStatus=\n"
               "> burstSlaveRead 0 1 2 3 1 0\nrc=0x00000000\nbuffer=\nstatus=2\n"
               "> burstSlaveWrite 0 1 2 3 1\nrc=0x00000000\nstatus=0\n");
-    EXPECT_EQ(g_calls, (std::vector<std::string>{"h1 getSlaveHandles 0,1 null 0",
-                                                 "h1 getBusErrorStatus 0,1 null 0",
-                                                 "h1 burstSlaveRead 0,1,2 3 1 null 0",
-                                                 "h1 burstSlaveWrite 0,1,2 3 1 null 0"}));
+    EXPECT_EQ(g_calls,
+              (std::vector<std::string>{
+                  "h1 getSlaveHandles 0,1 null 0", "h1 getBusErrorStatus 0,1 null 0",
+                  "h1 burstSlaveRead 0,1,2 3 1 null 0", "h1 burstSlaveWrite 0,1,2 3 1 null 0"}));
 }
 
 TEST_F(ConsoleTest, BusWordsInHexCountsAndStatusInDecimal) {
@@ -313,17 +311,17 @@ TEST_F(ConsoleTest, StatusOffPassesNullAndPrintsNoStatusLine) {
 }
 
 TEST_F(ConsoleTest, MapArgumentsAndChoices) {
-    EXPECT_EQ(run({"getRegisters 0 1 2", "getRegisters 0 1 2 CTRL \"MODE\"",
-                   "setRegisters 0 1 2 CTRL=0x1 \"LABEL=a b, c\" EXPR=x=y CTRL=2",
-                   "getParameterChoices 0 1 2 line_rate refclk=125",
-                   "getSlaveInfo 0 1 0 mine=kept"}),
-              "> getRegisters 0 1 2\nrc=0x00000000\nCTRL=0001\nSTATUS=8000\n"
-              "> getRegisters 0 1 2 CTRL \"MODE\"\nrc=0x00000000\nCTRL=\nMODE=\n"
-              "> setRegisters 0 1 2 CTRL=0x1 \"LABEL=a b, c\" EXPR=x=y CTRL=2\nrc=0x00000000\n"
-              "> getParameterChoices 0 1 2 line_rate refclk=125\nrc=0x00000000\n"
-              "choice=10.3125 Gbps, 2 lanes\nchoice=with\\nfeed\n"
-              "> getSlaveInfo 0 1 0 mine=kept\nrc=0x00000000\ncg_ver=2.3\ncg_ver.major=2\n"
-              "mine=kept\nnext_slave=1\nslave_type=17\n");
+    EXPECT_EQ(
+        run({"getRegisters 0 1 2", "getRegisters 0 1 2 CTRL \"MODE\"",
+             "setRegisters 0 1 2 CTRL=0x1 \"LABEL=a b, c\" EXPR=x=y CTRL=2",
+             "getParameterChoices 0 1 2 line_rate refclk=125", "getSlaveInfo 0 1 0 mine=kept"}),
+        "> getRegisters 0 1 2\nrc=0x00000000\nCTRL=0001\nSTATUS=8000\n"
+        "> getRegisters 0 1 2 CTRL \"MODE\"\nrc=0x00000000\nCTRL=\nMODE=\n"
+        "> setRegisters 0 1 2 CTRL=0x1 \"LABEL=a b, c\" EXPR=x=y CTRL=2\nrc=0x00000000\n"
+        "> getParameterChoices 0 1 2 line_rate refclk=125\nrc=0x00000000\n"
+        "choice=10.3125 Gbps, 2 lanes\nchoice=with\\nfeed\n"
+        "> getSlaveInfo 0 1 0 mine=kept\nrc=0x00000000\ncg_ver=2.3\ncg_ver.major=2\n"
+        "mine=kept\nnext_slave=1\nslave_type=17\n");
     EXPECT_EQ(g_calls, (std::vector<std::string>{
                            "h1 getRegisters 0,1,2", "h1 getRegisters 0,1,2 CTRL= MODE=",
                            "h1 setRegisters 0,1,2 CTRL=2 EXPR=x=y LABEL=a b, c",
@@ -347,10 +345,10 @@ TEST_F(ConsoleTest, SessionHandleGoesToEveryCall) {
 }
 
 TEST_F(ConsoleTest, UsageErrorsAreReportedAndTheConsoleGoesOn) {
-    const std::string out = run({"frobnicate 1", "resetBus 0 1", "getSlaveCount 0", "peek 0 1",
-                                 "singleSlaveRead 0 1 2 0x1G", "getSlaveHandles 0 1 0x20001",
-                                 "read 0 1 2 0 4294967295", "status maybe", "session",
-                                 "getRegisters 0 1 \"2", "getSlaveCount 0 1"});
+    const std::string out =
+        run({"frobnicate 1", "resetBus 0 1", "getSlaveCount 0", "peek 0 1",
+             "singleSlaveRead 0 1 2 0x1G", "getSlaveHandles 0 1 0x20001", "read 0 1 2 0 4294967295",
+             "status maybe", "session", "getRegisters 0 1 \"2", "getSlaveCount 0 1"});
     EXPECT_EQ(out,
               "> frobnicate 1\n> resetBus 0 1\n> getSlaveCount 0\n> peek 0 1\n"
               "> singleSlaveRead 0 1 2 0x1G\n> getSlaveHandles 0 1 0x20001\n"
@@ -379,18 +377,16 @@ TEST_F(ConsoleTest, DumpInitializesOnlyWhatThisConsoleHasNotInitialized) {
               "parameters: rc=0x00000000\n  line_rate=10.3125\n  refclk_freq=125\n");
     run({"dump 0 1 0", "initialize 0 1 1", "dump 0 1 1", "terminate 0 1 0", "dump 0 1 0",
          "endSession", "dump 0 1 1"});
-    EXPECT_EQ(g_calls, (std::vector<std::string>{
-                           "h1 initialize 0,1,0", "h1 getRegisters 0,1,0",
-                           "h1 getParameters 0,1,0 refclk_freq=125",
-                           // second dump: no initialize
-                           "h1 getRegisters 0,1,0", "h1 getParameters 0,1,0",
-                           "h1 initialize 0,1,1", "h1 getRegisters 0,1,1",
-                           "h1 getParameters 0,1,1", "h1 terminate 0,1,0",
-                           "h1 initialize 0,1,0", "h1 getRegisters 0,1,0",
-                           "h1 getParameters 0,1,0",
-                           // the session ended: its slave objects are gone
-                           "h1 initialize 0,1,1", "h1 getRegisters 0,1,1",
-                           "h1 getParameters 0,1,1"}));
+    EXPECT_EQ(g_calls,
+              (std::vector<std::string>{
+                  "h1 initialize 0,1,0", "h1 getRegisters 0,1,0",
+                  "h1 getParameters 0,1,0 refclk_freq=125",
+                  // second dump: no initialize
+                  "h1 getRegisters 0,1,0", "h1 getParameters 0,1,0", "h1 initialize 0,1,1",
+                  "h1 getRegisters 0,1,1", "h1 getParameters 0,1,1", "h1 terminate 0,1,0",
+                  "h1 initialize 0,1,0", "h1 getRegisters 0,1,0", "h1 getParameters 0,1,0",
+                  // the session ended: its slave objects are gone
+                  "h1 initialize 0,1,1", "h1 getRegisters 0,1,1", "h1 getParameters 0,1,1"}));
     EXPECT_EQ(status(), 0);
 }
 

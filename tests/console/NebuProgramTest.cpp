@@ -129,8 +129,9 @@ TEST_F(NebuProgramTest, BadBoardFilesAreNamedAndTheConsoleDoesNotStart) {
         (dir_ / "absent.json").string(),
         write("broken.json", "{\"devices\": [ {\"chains\": "),
         write("shape.json", "{\"devices\": 5}"),
-        write("range.json",
-              R"({"devices": [{"chains": {"1": {"cores": [{"type": 14, "master": {"slaveCount": 300}}]}}}]})"),
+        write(
+            "range.json",
+            R"({"devices": [{"chains": {"1": {"cores": [{"type": 14, "master": {"slaveCount": 300}}]}}}]})"),
     };
     for (const auto& board : boards) {
         const Result r = run({"--board", board, "--plugin", NEBU_PLUGIN_PATH, "-e", "stats"});
@@ -149,30 +150,27 @@ TEST_F(NebuProgramTest, PeekAndPokeReachTheBoardDirectly) {
                            "peek 0 1 0 0x1FFFF 2", "-e", "peek 0 1 0 0 0", "-e", "stats"});
     EXPECT_EQ(r.err, "");
     EXPECT_EQ(r.status, 0);
-    EXPECT_EQ(lines(r.out), (std::vector<std::string>{
-                                "> peek 0 1 0 0x10", "peek=0x1234",
-                                "> peek 0 1 0 0x20 3", "peek=0x0001 0x0002 0x0003",
-                                "> poke 0 1 0 0x21 0xbeef 7",
-                                "> peek 0 1 0 0x1F 4", "peek=0x0000 0x0001 0xBEEF 0x0007",
-                                // the address wraps at the end of the bus
-                                "> peek 0 1 0 0x1FFFF 2", "peek=0xAAAA 0x0000",
-                                "> poke 0 1 0 0x1FFFF 5 6",
-                                "> peek 0 1 0 0x1FFFF 2", "peek=0x0005 0x0006",
-                                "> peek 0 1 0 0 0", "peek=",
-                                // no JTAG was involved
-                                "> stats", NO_JTAG_STATS}));
+    EXPECT_EQ(
+        lines(r.out),
+        (std::vector<std::string>{
+            "> peek 0 1 0 0x10", "peek=0x1234", "> peek 0 1 0 0x20 3", "peek=0x0001 0x0002 0x0003",
+            "> poke 0 1 0 0x21 0xbeef 7", "> peek 0 1 0 0x1F 4", "peek=0x0000 0x0001 0xBEEF 0x0007",
+            // the address wraps at the end of the bus
+            "> peek 0 1 0 0x1FFFF 2", "peek=0xAAAA 0x0000", "> poke 0 1 0 0x1FFFF 5 6",
+            "> peek 0 1 0 0x1FFFF 2", "peek=0x0005 0x0006", "> peek 0 1 0 0 0", "peek=",
+            // no JTAG was involved
+            "> stats", NO_JTAG_STATS}));
 }
 
 TEST_F(NebuProgramTest, BadPeekAndPokeWriteNothingAndTheConsoleGoesOn) {
     const Result r = runOnBoard({"-e", "poke 0 1 0 0x10 1 0x10000", "-e", "poke 0 1 0 0x10 2 x",
                                  "-e", "peek 0 1 0 0x20000", "-e", "peek 0 1 9 0", "-e",
-                                 "peek 0 2 0 0", "-e", "poke 0 1 0 0x10", "-e",
-                                 "peek 0 1 0 0x10"});
+                                 "peek 0 2 0 0", "-e", "poke 0 1 0 0x10", "-e", "peek 0 1 0 0x10"});
     EXPECT_EQ(r.status, 2);
-    EXPECT_EQ(lines(r.out), (std::vector<std::string>{
-                                "> poke 0 1 0 0x10 1 0x10000", "> poke 0 1 0 0x10 2 x",
-                                "> peek 0 1 0 0x20000", "> peek 0 1 9 0", "> peek 0 2 0 0",
-                                "> poke 0 1 0 0x10", "> peek 0 1 0 0x10", "peek=0x1234"}));
+    EXPECT_EQ(lines(r.out),
+              (std::vector<std::string>{"> poke 0 1 0 0x10 1 0x10000", "> poke 0 1 0 0x10 2 x",
+                                        "> peek 0 1 0 0x20000", "> peek 0 1 9 0", "> peek 0 2 0 0",
+                                        "> poke 0 1 0 0x10", "> peek 0 1 0 0x10", "peek=0x1234"}));
     const auto errors = lines(r.err);
     ASSERT_EQ(errors.size(), 6u) << r.err;
     EXPECT_EQ(errors[0], "nebu: VALUE 0x10000 does not fit 16 bits");
@@ -199,12 +197,12 @@ TEST_F(NebuProgramTest, FunctionsThePluginDoesNotExportAreUnknownCommands) {
     // A host library exports none of the plug-in's functions.
     const std::string noExports =
         (fs::path(NEBU_PLUGIN_PATH).parent_path() / "libOrvUtil.so").string();
-    const Result r = run({"--board", board_, "--plugin", noExports, "-e", "getSlaveCount 0 1",
-                          "-e", "scan", "-e", "status off", "-e", "peek 0 1 0 0x10"});
+    const Result r = run({"--board", board_, "--plugin", noExports, "-e", "getSlaveCount 0 1", "-e",
+                          "scan", "-e", "status off", "-e", "peek 0 1 0 0x10"});
     EXPECT_EQ(r.status, 2);
-    EXPECT_EQ(lines(r.out), (std::vector<std::string>{"> getSlaveCount 0 1", "> scan",
-                                                      "> status off", "> peek 0 1 0 0x10",
-                                                      "peek=0x1234"}));
+    EXPECT_EQ(lines(r.out),
+              (std::vector<std::string>{"> getSlaveCount 0 1", "> scan", "> status off",
+                                        "> peek 0 1 0 0x10", "peek=0x1234"}));
     EXPECT_EQ(lines(r.err),
               (std::vector<std::string>{
                   "nebu: unknown command 'getSlaveCount' (the plug-in does not export "
@@ -214,29 +212,29 @@ TEST_F(NebuProgramTest, FunctionsThePluginDoesNotExportAreUnknownCommands) {
 }
 
 TEST_F(NebuProgramTest, SessionsStatusAndStatsAreConsoleCommands) {
-    const Result r = runOnBoard({"--session", "9", "-e", "stats", "-e", "session 3", "-e",
-                                 "status off", "-e", "status on", "-e", "endSession", "-e",
-                                 "endSession 9", "-e", "stats"});
+    const Result r =
+        runOnBoard({"--session", "9", "-e", "stats", "-e", "session 3", "-e", "status off", "-e",
+                    "status on", "-e", "endSession", "-e", "endSession 9", "-e", "stats"});
     EXPECT_EQ(r.err, "");
     EXPECT_EQ(r.status, 0);
-    EXPECT_EQ(lines(r.out),
-              (std::vector<std::string>{"> stats", NO_JTAG_STATS, "> session 3", "> status off",
-                                        "> status on", "> endSession", "> endSession 9",
-                                        "> stats", NO_JTAG_STATS}));
+    EXPECT_EQ(lines(r.out), (std::vector<std::string>{"> stats", NO_JTAG_STATS, "> session 3",
+                                                      "> status off", "> status on", "> endSession",
+                                                      "> endSession 9", "> stats", NO_JTAG_STATS}));
 
     const Result bad = runOnBoard({"-e", "session -1", "-e", "endSession 1 2", "-e", "stats x"});
     EXPECT_EQ(bad.status, 2);
-    EXPECT_EQ(lines(bad.err), (std::vector<std::string>{"nebu: bad number '-1' for N",
-                                                        "nebu: usage: endSession [N]",
-                                                        "nebu: usage: stats"}));
+    EXPECT_EQ(lines(bad.err),
+              (std::vector<std::string>{"nebu: bad number '-1' for N",
+                                        "nebu: usage: endSession [N]", "nebu: usage: stats"}));
 }
 
 TEST_F(NebuProgramTest, StandardInputWithoutATerminalHasNoPrompt) {
-    const Result r = runOnBoard({}, "peek 0 1 0 0x10\n\n   # a comment\r\n\tstats \t\npoke 0 1 0 0x10 1");
+    const Result r =
+        runOnBoard({}, "peek 0 1 0 0x10\n\n   # a comment\r\n\tstats \t\npoke 0 1 0 0x10 1");
     EXPECT_EQ(r.err, "");
     EXPECT_EQ(r.status, 0);
-    EXPECT_EQ(r.out, std::string("> peek 0 1 0 0x10\npeek=0x1234\n> \tstats \t\n") +
-                         NO_JTAG_STATS + "\n> poke 0 1 0 0x10 1\n");
+    EXPECT_EQ(r.out, std::string("> peek 0 1 0 0x10\npeek=0x1234\n> \tstats \t\n") + NO_JTAG_STATS +
+                         "\n> poke 0 1 0 0x10 1\n");
 }
 
 TEST_F(NebuProgramTest, ScriptRunsBeforeTheCommandsOfTheCommandLine) {
@@ -248,16 +246,16 @@ TEST_F(NebuProgramTest, ScriptRunsBeforeTheCommandsOfTheCommandLine) {
     Result r = runOnBoard({script, "-e", "peek 0 1 0 0x3F 2"});
     EXPECT_EQ(r.err, "");
     EXPECT_EQ(r.status, 0);
-    EXPECT_EQ(lines(r.out), (std::vector<std::string>{
-                                "> poke 0 1 0 0x40 \"0x0042\"   # quoted number",
-                                "> peek 0 1 0 0x40", "peek=0x0042", "> peek 0 1 0 0x3F 2",
-                                "peek=0x0000 0x0042"}));
+    EXPECT_EQ(lines(r.out),
+              (std::vector<std::string>{"> poke 0 1 0 0x40 \"0x0042\"   # quoted number",
+                                        "> peek 0 1 0 0x40", "peek=0x0042", "> peek 0 1 0 0x3F 2",
+                                        "peek=0x0000 0x0042"}));
     // A script's usage error does not stop the script.
     const std::string bad = write("bad.nebu", "bogus\npeek 0 1 0 0x10\n");
     r = runOnBoard({bad});
     EXPECT_EQ(r.status, 2);
-    EXPECT_EQ(lines(r.out), (std::vector<std::string>{"> bogus", "> peek 0 1 0 0x10",
-                                                      "peek=0x1234"}));
+    EXPECT_EQ(lines(r.out),
+              (std::vector<std::string>{"> bogus", "> peek 0 1 0 0x10", "peek=0x1234"}));
     EXPECT_EQ(r.err, "nebu: unknown command 'bogus'\n");
 }
 

@@ -1,8 +1,7 @@
 // The console's command-line options.
-#include "Options.h"
-
 #include <gtest/gtest.h>
 
+#include "Options.h"
 #include "UsageError.h"
 
 namespace nebu {
@@ -21,9 +20,9 @@ TEST(OptionsTest, DefaultsLeaveTheLocationsToTheProgram) {
 }
 
 TEST(OptionsTest, EveryOptionInBothSpellings) {
-    const Options o = parseOptions({"--board", "b.json", "--data-dir=/d", "--session", "0x10",
-                                    "--trace", "--plugin=/p.so", "-e", "stats", "-e",
-                                    "peek 0 1 0 0x10", "tour.nebu"});
+    const Options o =
+        parseOptions({"--board", "b.json", "--data-dir=/d", "--session", "0x10", "--trace",
+                      "--plugin=/p.so", "-e", "stats", "-e", "peek 0 1 0 0x10", "tour.nebu"});
     EXPECT_EQ(o.boardFile, "b.json");
     EXPECT_EQ(o.dataDir, "/d");
     EXPECT_EQ(o.session, 16u);
@@ -40,9 +39,12 @@ TEST(OptionsTest, EveryOptionInBothSpellings) {
 
 TEST(OptionsTest, MistakesAreUsageErrors) {
     const std::vector<std::vector<std::string>> bad = {
-        {"--bogus"},          {"-x"},           {"--board"},         {"-e"},
-        {"--session", "1x"},  {"--session"},    {"--trace=yes"},     {"a.nebu", "b.nebu"},
-        {"--board="},         {"--session", "4294967296"},           {"--", "a", "b"}};
+        {"--bogus"},         {"-x"},
+        {"--board"},         {"-e"},
+        {"--session", "1x"}, {"--session"},
+        {"--trace=yes"},     {"a.nebu", "b.nebu"},
+        {"--board="},        {"--session", "4294967296"},
+        {"--", "a", "b"}};
     for (const auto& args : bad) {
         EXPECT_THROW(parseOptions(args), UsageError) << args[0];
     }

@@ -61,8 +61,8 @@ int runNebu(int argc, char** argv, std::istream& in, std::ostream& out, std::ost
             scriptFile.open(options.script);
             if (!scriptFile) throw UsageError("cannot open script " + options.script);
         }
-        auto board = loadBoard(options.boardFile.empty() ? share + "boards/demo.json"
-                                                         : options.boardFile);
+        auto board =
+            loadBoard(options.boardFile.empty() ? share + "boards/demo.json" : options.boardFile);
 
         HostReset hostReset;
         SharedLibrary plugin(options.pluginPath.empty() ? defaultPluginPath(exeDir)

@@ -17,6 +17,7 @@ constexpr size_t ANY = std::numeric_limits<size_t>::max();
 }
 
 const std::vector<Console::Command>& Console::commands() {
+    // clang-format off
     static const std::vector<Command> table = {
         {"initialize", "D C S", 3, 3, {"initialize"}, &Console::cmdInitialize,
          "create the slave object"},
@@ -95,6 +96,7 @@ const std::vector<Console::Command>& Console::commands() {
         {"quit", "", 0, 0, {}, &Console::cmdQuit, "read no more commands (also: exit)"},
         {"exit", "", 0, 0, {}, &Console::cmdQuit, "read no more commands"},
     };
+    // clang-format on
     return table;
 }
 

@@ -126,9 +126,9 @@ void Console::cmdScan(const Words&) {
                 print(where + "getSlaveCount failed, " + formatRc(rc));
                 continue;
             }
-            print(where + (slaves == 0 ? std::string("no bus")
-                                       : std::to_string(slaves) +
-                                             (slaves == 1 ? " slave" : " slaves")));
+            print(where + (slaves == 0
+                               ? std::string("no bus")
+                               : std::to_string(slaves) + (slaves == 1 ? " slave" : " slaves")));
             for (uint32_t index = 0; index < slaves; ++index) {
                 HostMap info;
                 const ORV_SLAVE_REF ref{device, chain, index};

@@ -139,8 +139,8 @@ void Console::cmdGetBusErrorStatus(const Words& args) {
     const uint32_t len = count(args, 2, "LEN");
     std::vector<uint32_t> status(len, 0xFFFFFFFFu);
     useSession();
-    reportRc(api_.getBusErrorStatus(session_, device, chain, len != 0 ? status.data() : nullptr,
-                                    len));
+    reportRc(
+        api_.getBusErrorStatus(session_, device, chain, len != 0 ? status.data() : nullptr, len));
     print(formatDecimalWords("errorStatus", status));
 }
 
@@ -238,8 +238,8 @@ void Console::cmdBurstSlaveRead(const Words& args) {
     std::vector<uint32_t> buffer(n, 0xFFFFFFFFu);
     uint32_t status = 0;
     useSession();
-    reportRc(api_.burstSlaveRead(session_, ref, address, incr, n != 0 ? buffer.data() : nullptr,
-                                 n, statusPointer(status)));
+    reportRc(api_.burstSlaveRead(session_, ref, address, incr, n != 0 ? buffer.data() : nullptr, n,
+                                 statusPointer(status)));
     print(formatDataWords("buffer", buffer));
     printStatus(status);
 }
@@ -256,8 +256,8 @@ void Console::cmdBurstSlaveWrite(const Words& args) {
     const auto n = static_cast<uint32_t>(values.size());
     uint32_t status = 0;
     useSession();
-    reportRc(api_.burstSlaveWrite(session_, ref, address, incr, n != 0 ? values.data() : nullptr,
-                                  n, statusPointer(status)));
+    reportRc(api_.burstSlaveWrite(session_, ref, address, incr, n != 0 ? values.data() : nullptr, n,
+                                  statusPointer(status)));
     printStatus(status);
 }
 
@@ -268,8 +268,8 @@ void Console::cmdBroadcastSingleWrite(const Words& args) {
     const uint32_t value = number(args, 3, "VALUE");
     uint32_t status = 0;
     useSession();
-    reportRc(api_.broadcastSingleWrite(session_, device, chain, address, value,
-                                       statusPointer(status)));
+    reportRc(
+        api_.broadcastSingleWrite(session_, device, chain, address, value, statusPointer(status)));
     printStatus(status);
 }
 

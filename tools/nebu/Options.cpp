@@ -22,8 +22,8 @@ Options parseOptions(const std::vector<std::string>& args) {
     Options options;
     bool scriptSeen = false;
     auto setScript = [&](const std::string& path) {
-        if (scriptSeen) throw UsageError("more than one script: '" + options.script + "', '" +
-                                         path + "'");
+        if (scriptSeen)
+            throw UsageError("more than one script: '" + options.script + "', '" + path + "'");
         options.script = path;
         scriptSeen = true;
     };

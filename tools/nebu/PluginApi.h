@@ -7,33 +7,33 @@
 #include "orvnebu/orvnebu.h"
 
 // X(name): every exported function, in the order of the public header.
-#define NEBU_EXPORTED_FUNCTIONS(X)                                                          \
-    X(initialize)                                                                           \
-    X(terminate)                                                                            \
-    X(getBusInfo)                                                                           \
-    X(getSlaveCount)                                                                        \
-    X(getSlaveHandles)                                                                      \
-    X(getSlaveInfo)                                                                         \
-    X(getRegisters)                                                                         \
-    X(setRegisters)                                                                         \
-    X(getParameters)                                                                        \
-    X(setParameters)                                                                        \
-    X(getParameterChoices)                                                                  \
-    X(read)                                                                                 \
-    X(write)                                                                                \
-    X(getBusErrorStatus)                                                                    \
-    X(clearBusErrorStatus)                                                                  \
-    X(resetBus)                                                                             \
-    X(testSlaveInterface)                                                                   \
-    X(resetSlave)                                                                           \
-    X(disableSlave)                                                                         \
-    X(enableSlave)                                                                          \
-    X(singleSlaveRead)                                                                      \
-    X(singleSlaveWrite)                                                                     \
-    X(singleSlaveReadModifyWrite)                                                           \
-    X(singleSlaveWriteAndInspect)                                                           \
-    X(burstSlaveRead)                                                                       \
-    X(burstSlaveWrite)                                                                      \
+#define NEBU_EXPORTED_FUNCTIONS(X) \
+    X(initialize)                  \
+    X(terminate)                   \
+    X(getBusInfo)                  \
+    X(getSlaveCount)               \
+    X(getSlaveHandles)             \
+    X(getSlaveInfo)                \
+    X(getRegisters)                \
+    X(setRegisters)                \
+    X(getParameters)               \
+    X(setParameters)               \
+    X(getParameterChoices)         \
+    X(read)                        \
+    X(write)                       \
+    X(getBusErrorStatus)           \
+    X(clearBusErrorStatus)         \
+    X(resetBus)                    \
+    X(testSlaveInterface)          \
+    X(resetSlave)                  \
+    X(disableSlave)                \
+    X(enableSlave)                 \
+    X(singleSlaveRead)             \
+    X(singleSlaveWrite)            \
+    X(singleSlaveReadModifyWrite)  \
+    X(singleSlaveWriteAndInspect)  \
+    X(burstSlaveRead)              \
+    X(burstSlaveWrite)             \
     X(broadcastSingleWrite)
 
 namespace nebu {

@@ -13,10 +13,18 @@ std::string escapeText(const std::string& text) {
     for (char c : text) {
         const auto byte = static_cast<unsigned char>(c);
         switch (c) {
-            case '\\': out += "\\\\"; break;
-            case '\n': out += "\\n"; break;
-            case '\r': out += "\\r"; break;
-            case '\t': out += "\\t"; break;
+            case '\\':
+                out += "\\\\";
+                break;
+            case '\n':
+                out += "\\n";
+                break;
+            case '\r':
+                out += "\\r";
+                break;
+            case '\t':
+                out += "\\t";
+                break;
             default:
                 if (byte < 0x20) {
                     char hex[8];
@@ -57,8 +65,7 @@ std::vector<std::string> formatMapLines(const std::unordered_map<std::string, st
 
 namespace {
 template <class Format>
-std::string joinWords(const std::string& name, const std::vector<uint32_t>& words,
-                      Format format) {
+std::string joinWords(const std::string& name, const std::vector<uint32_t>& words, Format format) {
     std::string line = name + "=";
     for (size_t i = 0; i < words.size(); ++i) {
         if (i != 0) line += ' ';
