@@ -13,6 +13,7 @@
 #include "host/OrvJtag.h"
 #include "hostsim/Sim.h"
 #include "hostsim/board/Board.h"
+#include "support/TestHost.h"
 
 namespace nebu {
 namespace {
@@ -206,10 +207,11 @@ PluginApi fakeApi() {
     return api;  // resetBus and the others stay missing
 }
 
-class ConsoleTest : public ::testing::Test {
+// The console replaces the fixture's message sink with its own, which prints.
+class ConsoleTest : public TestHost {
 protected:
     void SetUp() override {
-        OrvSim::resetHost();
+        TestHost::SetUp();
         g_calls.clear();
         g_rc = ORVNEBU_OK;
         console_ = std::make_unique<Console>(fakeApi(), out_, err_, 1);
@@ -218,7 +220,7 @@ protected:
     void TearDown() override {
         console_->finish();
         console_.reset();
-        OrvSim::resetHost();
+        TestHost::TearDown();
     }
     // Runs the lines and returns what they printed on standard output.
     std::string run(std::initializer_list<const char*> lines) {
@@ -401,11 +403,10 @@ TEST_F(ConsoleTest, DumpStopsWhenInitializeFails) {
 }
 
 TEST_F(ConsoleTest, ScanWalksEveryChainOfTheBoard) {
-    OrvSim::setBoard(OrvSim::Board::loadText(R"({"devices": [
+    loadBoard(R"({"devices": [
         {"chains": {"1": {"cores": [{"type": 3}, {"type": 14, "master": {"slaveCount": 2}}]},
                     "2": {"cores": []}}},
-        {"trellom": true, "chains": {}}]})",
-                                             "scan.json"));
+        {"trellom": true, "chains": {}}]})");
     EXPECT_EQ(run({"scan"}),
               "> scan\n"
               "device 0 chain 1: 2 slaves\n"
