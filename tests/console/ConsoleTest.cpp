@@ -347,15 +347,15 @@ TEST_F(ConsoleTest, SessionHandleGoesToEveryCall) {
 }
 
 TEST_F(ConsoleTest, UsageErrorsAreReportedAndTheConsoleGoesOn) {
-    const std::string out =
-        run({"frobnicate 1", "resetBus 0 1", "getSlaveCount 0", "peek 0 1",
-             "singleSlaveRead 0 1 2 0x1G", "getSlaveHandles 0 1 0x20001", "read 0 1 2 0 4294967295",
-             "status maybe", "session", "getRegisters 0 1 \"2", "getSlaveCount 0 1"});
+    const std::string out = run({"frobnicate 1", "resetBus 0 1", "getSlaveCount 0", "peek 0 1",
+                                 "singleSlaveRead 0 1 2 0x1G", "getSlaveHandles 0 1 0x20001",
+                                 "read 0 1 2 0 4294967295", "status maybe", "session",
+                                 "getRegisters 0 1 \"2", "frob\rnicate", "getSlaveCount 0 1"});
     EXPECT_EQ(out,
               "> frobnicate 1\n> resetBus 0 1\n> getSlaveCount 0\n> peek 0 1\n"
               "> singleSlaveRead 0 1 2 0x1G\n> getSlaveHandles 0 1 0x20001\n"
               "> read 0 1 2 0 4294967295\n> status maybe\n> session\n> getRegisters 0 1 \"2\n"
-              "> getSlaveCount 0 1\nrc=0x00000000\ncount=2\n");
+              "> frob\rnicate\n> getSlaveCount 0 1\nrc=0x00000000\ncount=2\n");
     EXPECT_EQ(err(),
               "nebu: unknown command 'frobnicate'\n"
               "nebu: unknown command 'resetBus' (the plug-in does not export OrvNebu_resetBus)\n"
@@ -366,7 +366,8 @@ TEST_F(ConsoleTest, UsageErrorsAreReportedAndTheConsoleGoesOn) {
               "nebu: SIZE 4294967295 is more than the console allows (131072)\n"
               "nebu: usage: status on|off\n"
               "nebu: usage: session N\n"
-              "nebu: unterminated quote in: getRegisters 0 1 \"2\n");
+              "nebu: unterminated quote in: getRegisters 0 1 \"2\n"
+              "nebu: unknown command 'frob\\rnicate'\n");
     EXPECT_EQ(g_calls, (std::vector<std::string>{"h1 getSlaveCount 0,1"}));
     EXPECT_EQ(status(), 2);
 }

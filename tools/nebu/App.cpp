@@ -85,7 +85,7 @@ int runNebu(int argc, char** argv, std::istream& in, std::ostream& out, std::ost
         return console.exitStatus();
     } catch (const UsageError& e) {
         out.flush();
-        err << "nebu: " << e.what() << std::endl;
+        err << "nebu: " << oneLine(e.what()) << std::endl;
         return 2;
     }
 }

@@ -126,7 +126,7 @@ void Console::print(const std::string& line) { out_ << line << '\n'; }
 
 void Console::usageError(const std::string& text) {
     out_.flush();  // keep the error after the echo when both go to one terminal
-    err_ << "nebu: " << text << std::endl;
+    err_ << "nebu: " << oneLine(text) << std::endl;
     usageFailed_ = true;
 }
 
