@@ -1,6 +1,10 @@
 // The built nebu program run as a user runs it: options, board files, -e commands, scripts
 // and standard input, checking standard output, standard error and the exit status.
+#include <fcntl.h>
 #include <gtest/gtest.h>
+#include <poll.h>
+#include <pty.h>
+#include <spawn.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
@@ -235,6 +239,57 @@ TEST_F(NebuProgramTest, StandardInputWithoutATerminalHasNoPrompt) {
     EXPECT_EQ(r.status, 0);
     EXPECT_EQ(r.out, std::string("> peek 0 1 0 0x10\npeek=0x1234\n> \tstats \t\n") + NO_JTAG_STATS +
                          "\n> poke 0 1 0 0x10 1\n");
+}
+
+TEST_F(NebuProgramTest, TerminalInputGetsAPrompt) {
+    int master = -1;
+    int terminal = -1;
+    ASSERT_EQ(openpty(&master, &terminal, nullptr, nullptr, nullptr), 0);
+    const std::string err = (dir_ / "stderr.txt").string();
+    posix_spawn_file_actions_t actions;
+    posix_spawn_file_actions_init(&actions);
+    posix_spawn_file_actions_adddup2(&actions, terminal, 0);
+    posix_spawn_file_actions_adddup2(&actions, terminal, 1);
+    posix_spawn_file_actions_addopen(&actions, 2, err.c_str(), O_WRONLY | O_CREAT | O_TRUNC, 0600);
+    posix_spawn_file_actions_addclose(&actions, master);
+    posix_spawn_file_actions_addclose(&actions, terminal);
+    std::vector<std::string> args = {NEBU_CONSOLE_PATH, "--board", board_, "--plugin",
+                                     NEBU_PLUGIN_PATH};
+    std::vector<char*> argv;
+    for (auto& arg : args) argv.push_back(arg.data());
+    argv.push_back(nullptr);
+    pid_t pid = -1;
+    const int spawned =
+        posix_spawn(&pid, NEBU_CONSOLE_PATH, &actions, nullptr, argv.data(), environ);
+    posix_spawn_file_actions_destroy(&actions);
+    close(terminal);
+    ASSERT_EQ(spawned, 0);
+
+    // A command, then end-of-file (Ctrl-D at the start of a line).
+    const std::string typed = "peek 0 1 0 0x10\n\x04";
+    ASSERT_EQ(::write(master, typed.data(), typed.size()), static_cast<ssize_t>(typed.size()));
+    std::string screen;
+    for (;;) {
+        pollfd ready{master, POLLIN, 0};
+        if (poll(&ready, 1, 10000) <= 0) break;  // only a guard against a hang
+        char buffer[512];
+        const ssize_t n = read(master, buffer, sizeof buffer);
+        if (n <= 0) break;  // the console has exited and closed the terminal
+        screen.append(buffer, static_cast<size_t>(n));
+    }
+    close(master);
+    int wait = 0;
+    ASSERT_EQ(waitpid(pid, &wait, 0), pid);
+    EXPECT_TRUE(WIFEXITED(wait) && WEXITSTATUS(wait) == 0) << wait;
+    EXPECT_EQ(readFile(err), "");
+    // The terminal shows the prompt, the typed line, the echo and the result; a prompt again
+    // before end-of-file.
+    const size_t prompt = screen.find("nebu> ");
+    const size_t result = screen.find("> peek 0 1 0 0x10\r\npeek=0x1234\r\n");
+    ASSERT_NE(prompt, std::string::npos) << screen;
+    ASSERT_NE(result, std::string::npos) << screen;
+    EXPECT_LT(prompt, result);
+    EXPECT_NE(screen.find("nebu> ", result), std::string::npos) << screen;
 }
 
 TEST_F(NebuProgramTest, ScriptRunsBeforeTheCommandsOfTheCommandLine) {
