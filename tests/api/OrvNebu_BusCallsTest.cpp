@@ -141,10 +141,10 @@ TEST_F(BusCallsTest, StatusPointersMayBeNull) {
     uint32_t word = 0;
     ASSERT_EQ(OrvNebu_singleSlaveWriteAndInspect(H, {0, 1, 0}, 0x22, 0x4444, &word, nullptr), 0u);
     EXPECT_EQ(word, 0x4444u);
-    EXPECT_EQ(board->peek(0, 1, 1, 0x20), 0x1122);
-    EXPECT_EQ(board->peek(0, 1, 0, 0x21), 0x3333);
-    EXPECT_EQ(board->peek(0, 1, 1, 0x21), 0x3333);
-    EXPECT_TRUE(messages.empty()) << joined();
+    EXPECT_EQ(board()->peek(0, 1, 1, 0x20), 0x1122);
+    EXPECT_EQ(board()->peek(0, 1, 0, 0x21), 0x3333);
+    EXPECT_EQ(board()->peek(0, 1, 1, 0x21), 0x3333);
+    EXPECT_TRUE(messages().empty()) << joined();
 }
 
 TEST_F(BusCallsTest, DataAlreadyReadStaysWhenTheStatusFails) {
@@ -162,16 +162,15 @@ TEST_F(BusCallsTest, DataAlreadyReadStaysWhenTheStatusFails) {
     EXPECT_EQ(OrvNebu_singleSlaveWriteAndInspect(H, {0, 1, 0}, 0x40, 0x1234, words, nullptr), 0u);
     EXPECT_EQ(OrvNebu_singleSlaveWrite(H, {0, 1, 2}, 0x40, 0x9999, &status), FAILED);
     EXPECT_EQ(words[0], 0x1234u);
-    EXPECT_EQ(board->peek(0, 1, 1, 0x40), 0x0F0F) << "position 2 is not slave 1";
+    EXPECT_EQ(board()->peek(0, 1, 1, 0x40), 0x0F0F) << "position 2 is not slave 1";
 }
 
 TEST_F(BusCallsTest, BusInfoNeedsTheMasterItWasFoundAs) {
     uint32_t count = 0;
     ASSERT_EQ(OrvNebu_getSlaveCount(H, 0, 1, &count), 0u);
     // The core at the master's place is now something else.
-    board = OrvSim::Board::loadText(R"({ "devices": [ { "chains": {
-        "1": { "cores": [ { "type": 5 } ] } } } ] })", "changed");
-    OrvSim::setBoard(board);
+    loadBoard(R"({ "devices": [ { "chains": {
+        "1": { "cores": [ { "type": 5 } ] } } } ] })");
     ORV_HASHMAP_HANDLE map = OrvContainer_hashmapCStr_new();
     clearLog();
     EXPECT_EQ(OrvNebu_getBusInfo(H, 0, 1, &map), FAILED);

@@ -43,20 +43,23 @@ TEST_F(FrameTest, ExceptionsBecomeOneMessageWithTheirSeverity) {
         SCOPED_TRACE(c.name);
         clearLog();
         EXPECT_EQ(lockedFrame(3, c.body), FAILED);
-        ASSERT_EQ(messages.size(), 1u);
-        EXPECT_EQ(messages[0].handle, 3u);
-        EXPECT_EQ(messages[0].severity, c.severity);
-        EXPECT_EQ(messages[0].text, c.text);
+        auto sent = messages();
+        ASSERT_EQ(sent.size(), 1u);
+        EXPECT_EQ(sent[0].handle, 3u);
+        EXPECT_EQ(sent[0].severity, c.severity);
+        EXPECT_EQ(sent[0].text, c.text);
 
         clearLog();
         EXPECT_EQ(unlockedFrame(4, c.body), FAILED);
-        ASSERT_EQ(messages.size(), 1u);
-        EXPECT_EQ(messages[0].handle, 4u);
-        EXPECT_EQ(messages[0].severity, c.severity);
+        sent = messages();
+        ASSERT_EQ(sent.size(), 1u);
+        EXPECT_EQ(sent[0].handle, 4u);
+        EXPECT_EQ(sent[0].severity, c.severity);
+        EXPECT_EQ(sent[0].text, c.text);
     }
     clearLog();
     EXPECT_EQ(lockedFrame(3, [] {}), 0u);
-    EXPECT_TRUE(messages.empty());
+    EXPECT_TRUE(messages().empty());
 }
 
 TEST_F(FrameTest, TheLockIsHeldForTheBodyAndReleasedBeforeTheMessage) {

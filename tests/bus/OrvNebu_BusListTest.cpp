@@ -75,7 +75,7 @@ TEST_F(BusListTest, DiscoveryFindsTheMasterCountsItsSlavesAndResetsTheBus) {
                                     "jtag status device=0 chain=1 core=1 type=14",
                                     jtagWrite(1, 6, 0x3F), jtagWrite(1, 6, 0x3E),
                                     jtagRead(2, 4, 0x2), jtagWrite(1, 6, 0x00)));
-    EXPECT_TRUE(messages.empty());
+    EXPECT_TRUE(messages().empty());
 
     // The bus is now known: no more device access to find it.
     clearLog();
@@ -113,8 +113,7 @@ TEST_F(BusListTest, SlaveCountRediscoversEveryTime) {
     EXPECT_EQ(countLines(jtagWrite(1, 6, 0x3F)), 1u) << "the new bus is reset again";
 
     // The new object follows the board: chain 1 now has two slave positions.
-    board = OrvSim::Board::loadText(BOARD_CHANGED, "changed");
-    OrvSim::setBoard(board);
+    loadBoard(BOARD_CHANGED);
     EXPECT_EQ(slaveCount(1, 0, 1), 2u);
     clearLog();
     ASSERT_EQ(OrvNebu_resetBus(1, 0, 1), 0u);
@@ -123,8 +122,7 @@ TEST_F(BusListTest, SlaveCountRediscoversEveryTime) {
 
 TEST_F(BusListTest, ABusThatDisappearsIsForgotten) {
     EXPECT_EQ(slaveCount(1, 0, 1), 4u);
-    board = OrvSim::Board::loadText(BOARD_NO_MASTER, "no master");
-    OrvSim::setBoard(board);
+    loadBoard(BOARD_NO_MASTER);
     EXPECT_EQ(slaveCount(1, 0, 1), 0u);
     clearLog();
     EXPECT_EQ(OrvNebu_resetBus(1, 0, 1), FAILED);
@@ -147,7 +145,7 @@ TEST_F(BusListTest, NoUsableBusCountsZeroAndCannotBeUsed) {
         SCOPED_TRACE(c.message);
         clearLog();
         EXPECT_EQ(slaveCount(1, c.device, c.userChain), 0u);
-        EXPECT_TRUE(messages.empty());
+        EXPECT_TRUE(messages().empty());
         EXPECT_EQ(OrvNebu_resetBus(1, c.device, c.userChain), FAILED);
         expectOnlyMessage(256, c.message);
     }
@@ -161,8 +159,7 @@ TEST_F(BusListTest, ABusWithoutPositionsReplacesAnEarlierOne) {
     EXPECT_EQ(slaveCount(1, 0, 1), 4u);
     const char* zero = R"({ "devices": [ { "chains": {
         "1": { "cores": [ { "type": 14, "master": { "slaveCount": 0 } } ] } } } ] })";
-    board = OrvSim::Board::loadText(zero, "zero");
-    OrvSim::setBoard(board);
+    loadBoard(zero);
     EXPECT_EQ(slaveCount(1, 0, 1), 0u);
     clearLog();
     EXPECT_EQ(touch(1, 0, 1), FAILED);
@@ -171,11 +168,9 @@ TEST_F(BusListTest, ABusWithoutPositionsReplacesAnEarlierOne) {
 
 TEST_F(BusListTest, AConfigurationControllerLeavesTheListAlone) {
     // Discovered while device 1 still was an ordinary device.
-    board = OrvSim::Board::loadText(BOARD_CHANGED, "changed");
-    OrvSim::setBoard(board);
+    loadBoard(BOARD_CHANGED);
     EXPECT_EQ(slaveCount(1, 1, 1), 2u);
-    board = OrvSim::Board::loadText(BOARD, "trellom again");
-    OrvSim::setBoard(board);
+    loadBoard(BOARD);
     EXPECT_EQ(slaveCount(1, 1, 1), 0u);
     clearLog();
     EXPECT_EQ(touch(1, 1, 1), 0u) << "the earlier bus is still listed";
@@ -206,7 +201,7 @@ TEST_F(BusListTest, TheListRegistersAgainOnceItHasBeenEmptied) {
     EXPECT_EQ(slaveCount(3, 0, 1), 4u);
     OrvSim::endSession(3);  // the list is empty now
     // A host that no longer knows the list: it must register again with its next bus.
-    freshHost();
+    freshHost(BOARD);
     EXPECT_EQ(slaveCount(4, 0, 2), 2u);
     OrvSim::endSession(4);
     clearLog();
@@ -218,8 +213,7 @@ TEST_F(BusListTest, AFailedResetKeepsTheNewBus) {
     const char* stuck = R"({ "devices": [ { "chains": {
         "1": { "cores": [ { "type": 14, "master": { "slaveCount": 1, "resetPolls": -1 } } ] }
         } } ] })";
-    board = OrvSim::Board::loadText(stuck, "stuck");
-    OrvSim::setBoard(board);
+    loadBoard(stuck);
     uint32_t count = 77;
     EXPECT_EQ(OrvNebu_getSlaveCount(1, 0, 1, &count), FAILED);
     EXPECT_EQ(count, 77u);

@@ -75,7 +75,7 @@ TEST_F(PivoTransactionTest, BusResetPulsesTheClockThenStrobesEveryBit) {
                                     jtagWrite(7, 4, 1), jtagWrite(7, 4, 0), jtagRead(7, 3, 0x2),
                                     jtagWrite(1, 6, 0x3F), jtagWrite(1, 6, 0x3E),
                                     jtagRead(2, 4, 0x2), jtagWrite(1, 6, 0x00)));
-    EXPECT_TRUE(messages.empty());
+    EXPECT_TRUE(messages().empty());
 
     // Clearing the error status is the same complete reset.
     const std::vector<std::string> reset = jtag();
@@ -106,7 +106,6 @@ TEST_F(PivoTransactionTest, ResetTimeoutZeroesTheControlWordAfterElevenPolls) {
     expected.push_back(jtagWrite(1, 4, 0));
     EXPECT_EQ(jtag(), expected);
     expectOnlyMessage(256, TIMED_OUT);
-    EXPECT_EQ(log.back(), "message 256: " + TIMED_OUT) << "the zero word goes out first";
 
     // The slave reset has the same handshake and the same failure.
     clearLog();
@@ -159,9 +158,10 @@ TEST_F(PivoTransactionTest, SlaveResetStrobesOneSlaveBit) {
     EXPECT_EQ(OrvNebu_resetSlave(H, slave(1, 4)), FAILED);
     EXPECT_EQ(OrvNebu_resetSlave(H, slave(1, 300)), FAILED);
     EXPECT_TRUE(jtag().empty());
-    ASSERT_EQ(messages.size(), 2u);
-    EXPECT_EQ(messages[0].text, BAD_INDEX);
-    EXPECT_EQ(messages[1].text, BAD_INDEX);
+    const auto sent = messages();
+    ASSERT_EQ(sent.size(), 2u);
+    EXPECT_EQ(sent[0].text, BAD_INDEX);
+    EXPECT_EQ(sent[1].text, BAD_INDEX);
 }
 
 TEST_F(PivoTransactionTest, SingleTransfersLayOutControlAddressAndData) {
@@ -177,7 +177,7 @@ TEST_F(PivoTransactionTest, SingleTransfersLayOutControlAddressAndData) {
     EXPECT_THAT(jtag(), ElementsAre(jtagWrite(4, 29, control(0, false, false, false, 3)),
                                     jtagWrite(5, 19, 0x3FFFF), jtagWrite(6, 18, 0x1234),
                                     "jtag flush"));
-    EXPECT_EQ(board->peek(0, 1, 3, 0x1FFFF), 0x1234);
+    EXPECT_EQ(board()->peek(0, 1, 3, 0x1FFFF), 0x1234);
 
     const OrvSim::JtagStats stats = OrvSim::takeStats(H);
     EXPECT_EQ(stats.commands, 6u);
@@ -187,7 +187,7 @@ TEST_F(PivoTransactionTest, SingleTransfersLayOutControlAddressAndData) {
 TEST_F(PivoTransactionTest, ReadModifyWriteKeepsTheMaskedBits) {
     discover(1);
     ASSERT_EQ(OrvNebu_singleSlaveReadModifyWrite(H, slave(1, 0), 0x10, 0x12, 0xFF00, nullptr), 0u);
-    EXPECT_EQ(board->peek(0, 1, 0, 0x10), 0xAB12);
+    EXPECT_EQ(board()->peek(0, 1, 0, 0x10), 0xAB12);
     EXPECT_THAT(jtag(), ElementsAre(jtagWrite(4, 29, 0), jtagWrite(5, 19, 0x00010),
                                     jtagRead(6, 16, 0xABCD), jtagWrite(4, 29, 0),
                                     jtagWrite(5, 19, 0x20010), jtagWrite(6, 18, 0xAB12),
@@ -206,17 +206,17 @@ TEST_F(PivoTransactionTest, ReadModifyWriteKeepsTheMaskedBits) {
 TEST_F(PivoTransactionTest, BurstsMoveSixteenBitsPerWord) {
     discover(1);
     const uint32_t out[3] = {0x1111, 0xA2B2, 0xFFFF3333u};
-    ASSERT_EQ(OrvNebu_burstSlaveWrite(H, slave(1, 2), 0x40, 1, out, 3, nullptr), 0u);
-    EXPECT_THAT(jtag(), ElementsAre(jtagWrite(4, 29, control(3, true, true, false, 2)),
+    ASSERT_EQ(OrvNebu_burstSlaveWrite(H, slave(1, 3), 0x40, 1, out, 3, nullptr), 0u);
+    EXPECT_THAT(jtag(), ElementsAre(jtagWrite(4, 29, control(3, true, true, false, 3)),
                                     jtagWrite(5, 19, 0x20040),
                                     jtagWrite(6, 50, 0x3333A2B21111ull), "jtag flush"));
     EXPECT_EQ(OrvSim::takeStats(H).writeBits, 29u + 19u + 50u);
 
     clearLog();
     uint32_t in[3] = {0, 0, 0};
-    ASSERT_EQ(OrvNebu_burstSlaveRead(H, slave(1, 2), 0x40, 1, in, 3, nullptr), 0u);
+    ASSERT_EQ(OrvNebu_burstSlaveRead(H, slave(1, 3), 0x40, 1, in, 3, nullptr), 0u);
     EXPECT_THAT(in, ElementsAre(0x1111u, 0xA2B2u, 0x3333u));
-    EXPECT_THAT(jtag(), ElementsAre(jtagWrite(4, 29, control(3, true, true, false, 2)),
+    EXPECT_THAT(jtag(), ElementsAre(jtagWrite(4, 29, control(3, true, true, false, 3)),
                                     jtagWrite(5, 19, 0x00040), jtagRead(6, 48, 0x3333A2B21111ull)));
     EXPECT_EQ(OrvSim::takeStats(H).readBits, 48u);
 
@@ -235,7 +235,7 @@ TEST_F(PivoTransactionTest, LongBurstsUseTheWholeCountField) {
     std::vector<uint32_t> back(1000, 0xDEAD);
     ASSERT_EQ(OrvNebu_burstSlaveRead(H, slave(1, 0), 0x1000, 1, back.data(), 1000, nullptr), 0u);
     EXPECT_EQ(back, words);
-    EXPECT_EQ(board->peek(0, 1, 0, 0x1000 + 999), words[999]);
+    EXPECT_EQ(board()->peek(0, 1, 0, 0x1000 + 999), words[999]);
     const OrvSim::JtagStats stats = OrvSim::takeStats(H);
     EXPECT_EQ(stats.commands, 6u);
     EXPECT_EQ(stats.readBits, 16000u);
@@ -258,15 +258,16 @@ TEST_F(PivoTransactionTest, WhatTheMasterCannotCarryIsRefusedBeforeAnythingIsSen
     EXPECT_TRUE(jtag().empty()) << joined();
     EXPECT_EQ(OrvSim::takeStats(H).commands, 0u);
     EXPECT_EQ(word, 0x9999u);
-    EXPECT_EQ(board->peek(0, 1, 0, 0x10), 0xABCD);
-    ASSERT_EQ(messages.size(), 7u);
+    EXPECT_EQ(board()->peek(0, 1, 0, 0x10), 0xABCD);
+    const auto sent = messages();
+    ASSERT_EQ(sent.size(), 7u);
     const std::string burst = "Invalid burst length (Word Count > Maximum Burst Length 131071).\n";
     const std::string address = "Invalid bus address (Address > Maximum Address 0x1FFFF).\n";
     const std::vector<std::string> expected = {burst,     burst,   BAD_INDEX, BAD_INDEX,
                                                address, address, address};
-    for (size_t i = 0; i < messages.size(); ++i) {
-        EXPECT_EQ(messages[i].text, expected[i]) << i;
-        EXPECT_EQ(messages[i].severity, 256u);
+    for (size_t i = 0; i < sent.size(); ++i) {
+        EXPECT_EQ(sent[i].text, expected[i]) << i;
+        EXPECT_EQ(sent[i].severity, 256u);
     }
 }
 
@@ -355,8 +356,8 @@ TEST_F(PivoTransactionTest, BroadcastWritesEverySlaveAndReportsOnlyBusBits) {
     EXPECT_THAT(jtag(), ElementsAre(jtagWrite(4, 29, control(0, false, false, true, 0)),
                                     jtagWrite(5, 19, 0x20030), jtagWrite(6, 18, 0x4242),
                                     "jtag flush", jtagRead(3, 6, 0x9)));
-    EXPECT_EQ(board->peek(0, 1, 0, 0x30), 0x4242);
-    EXPECT_EQ(board->peek(0, 1, 3, 0x30), 0x4242);
+    EXPECT_EQ(board()->peek(0, 1, 0, 0x30), 0x4242);
+    EXPECT_EQ(board()->peek(0, 1, 3, 0x30), 0x4242);
 
     clearLog();
     ASSERT_EQ(OrvNebu_broadcastSingleWrite(H, 0, 1, 0x31, 1, nullptr), 0u);
@@ -379,7 +380,7 @@ TEST_F(PivoTransactionTest, CallsWithoutBusTrafficSendNothing) {
 
     EXPECT_TRUE(jtag().empty());
     EXPECT_EQ(OrvSim::takeStats(H).commands, 0u);
-    EXPECT_TRUE(messages.empty());
+    EXPECT_TRUE(messages().empty());
 }
 
 TEST_F(PivoTransactionTest, BusInfoComesFromTheMasterStatus) {
