@@ -362,6 +362,15 @@ TEST_F(PivoTransactionTest, BroadcastWritesEverySlaveAndReportsOnlyBusBits) {
     clearLog();
     ASSERT_EQ(OrvNebu_broadcastSingleWrite(H, 0, 1, 0x31, 1, nullptr), 0u);
     EXPECT_EQ(jtag().size(), 4u);
+
+    // The first slave's own error bit stays out of the broadcast status: chain 6 keeps bus
+    // error bit 1 (its reset never completes) and its faulty slave 0 flags every transfer.
+    uint32_t count = 0;
+    EXPECT_EQ(OrvNebu_getSlaveCount(H, 0, 6, &count), FAILED);
+    ASSERT_EQ(OrvNebu_singleSlaveRead(H, slave(6, 0), 0, &word, &status), 0u);
+    EXPECT_EQ(status, 6u);
+    ASSERT_EQ(OrvNebu_broadcastSingleWrite(H, 0, 6, 0x31, 1, &status), 0u);
+    EXPECT_EQ(status, 2u);
 }
 
 TEST_F(PivoTransactionTest, CallsWithoutBusTrafficSendNothing) {
