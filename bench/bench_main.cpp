@@ -1,4 +1,0 @@
-// Entry point of the benchmark program.
-#include <benchmark/benchmark.h>
-
-BENCHMARK_MAIN();
