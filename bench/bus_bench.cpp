@@ -81,24 +81,20 @@ void singleSlaveReadModifyWrite(benchmark::State& s) {
     });
 }
 void singleSlaveWriteAndInspect(benchmark::State& s) {
-    runCall(s, [] {
-        return OrvNebu_singleSlaveWriteAndInspect(H, SLAVE, 0x10, 0x12, &word, nullptr);
-    });
+    runCall(
+        s, [] { return OrvNebu_singleSlaveWriteAndInspect(H, SLAVE, 0x10, 0x12, &word, nullptr); });
 }
 void burstSlaveRead64(benchmark::State& s) {
-    runCall(s, [] {
-        return OrvNebu_burstSlaveRead(H, SLAVE, 0x100, 1, burst.data(), 64, nullptr);
-    });
+    runCall(s,
+            [] { return OrvNebu_burstSlaveRead(H, SLAVE, 0x100, 1, burst.data(), 64, nullptr); });
 }
 void burstSlaveWrite64(benchmark::State& s) {
-    runCall(s, [] {
-        return OrvNebu_burstSlaveWrite(H, SLAVE, 0x100, 1, burst.data(), 64, nullptr);
-    });
+    runCall(s,
+            [] { return OrvNebu_burstSlaveWrite(H, SLAVE, 0x100, 1, burst.data(), 64, nullptr); });
 }
 void burstSlaveRead64Status(benchmark::State& s) {
-    runCall(s, [] {
-        return OrvNebu_burstSlaveRead(H, SLAVE, 0x100, 1, burst.data(), 64, &status);
-    });
+    runCall(s,
+            [] { return OrvNebu_burstSlaveRead(H, SLAVE, 0x100, 1, burst.data(), 64, &status); });
 }
 void broadcastSingleWrite(benchmark::State& s) {
     runCall(s, [] { return OrvNebu_broadcastSingleWrite(H, 0, 1, 0x20, 1, nullptr); });

@@ -34,7 +34,8 @@ ORVNEBU_API uint32_t ORVNEBU_CALL OrvNebu_getBusInfo(uint32_t handle, uint32_t d
 ORVNEBU_API uint32_t ORVNEBU_CALL OrvNebu_getSlaveCount(uint32_t handle, uint32_t device,
                                                         uint32_t userChain, uint32_t* count) {
     return lockedFrame(handle, [&] {
-        checkArgument(count != nullptr, "OrvNebu_getSlaveCount() argument checking failed:count != 0");
+        checkArgument(count != nullptr,
+                      "OrvNebu_getSlaveCount() argument checking failed:count != 0");
         *count = OrvNebu_BusList::getBusList()->discoverBus(handle, device, userChain);
     });
 }
@@ -110,8 +111,7 @@ ORVNEBU_API uint32_t ORVNEBU_CALL OrvNebu_singleSlaveRead(uint32_t handle, ORV_S
     });
 }
 
-ORVNEBU_API uint32_t ORVNEBU_CALL OrvNebu_singleSlaveWrite(uint32_t handle,
-                                                           ORV_SLAVE_REF slaveRef,
+ORVNEBU_API uint32_t ORVNEBU_CALL OrvNebu_singleSlaveWrite(uint32_t handle, ORV_SLAVE_REF slaveRef,
                                                            uint32_t address, uint32_t value,
                                                            uint32_t* status) {
     return onBus(handle, slaveRef.device, slaveRef.userChain, [&](OrvNebu_Transaction& bus) {
@@ -119,17 +119,19 @@ ORVNEBU_API uint32_t ORVNEBU_CALL OrvNebu_singleSlaveWrite(uint32_t handle,
     });
 }
 
-ORVNEBU_API uint32_t ORVNEBU_CALL OrvNebu_singleSlaveReadModifyWrite(
-    uint32_t handle, ORV_SLAVE_REF slaveRef, uint32_t address, uint32_t value, uint32_t mask,
-    uint32_t* status) {
+ORVNEBU_API uint32_t ORVNEBU_CALL OrvNebu_singleSlaveReadModifyWrite(uint32_t handle,
+                                                                     ORV_SLAVE_REF slaveRef,
+                                                                     uint32_t address,
+                                                                     uint32_t value, uint32_t mask,
+                                                                     uint32_t* status) {
     return onBus(handle, slaveRef.device, slaveRef.userChain, [&](OrvNebu_Transaction& bus) {
         bus.singleSlaveReadModifyWrite(handle, slaveRef, address, value, mask, status);
     });
 }
 
-ORVNEBU_API uint32_t ORVNEBU_CALL OrvNebu_singleSlaveWriteAndInspect(
-    uint32_t handle, ORV_SLAVE_REF slaveRef, uint32_t address, uint32_t value, uint32_t* rdBuf,
-    uint32_t* status) {
+ORVNEBU_API uint32_t ORVNEBU_CALL
+OrvNebu_singleSlaveWriteAndInspect(uint32_t handle, ORV_SLAVE_REF slaveRef, uint32_t address,
+                                   uint32_t value, uint32_t* rdBuf, uint32_t* status) {
     return onBus(handle, slaveRef.device, slaveRef.userChain, [&](OrvNebu_Transaction& bus) {
         checkArgument(rdBuf != nullptr,
                       "OrvNebu_singleSlaveWriteAndInspect() argument checking failed:rdBuf != 0");
@@ -151,8 +153,8 @@ ORVNEBU_API uint32_t ORVNEBU_CALL OrvNebu_burstSlaveRead(uint32_t handle, ORV_SL
 
 ORVNEBU_API uint32_t ORVNEBU_CALL OrvNebu_burstSlaveWrite(uint32_t handle, ORV_SLAVE_REF slaveRef,
                                                           uint32_t address, uint32_t incrAddress,
-                                                          const uint32_t* buffer,
-                                                          uint32_t numWrite, uint32_t* status) {
+                                                          const uint32_t* buffer, uint32_t numWrite,
+                                                          uint32_t* status) {
     return onBus(handle, slaveRef.device, slaveRef.userChain, [&](OrvNebu_Transaction& bus) {
         checkArgument(buffer != nullptr && numWrite != 0,
                       "OrvNebu_burstSlaveWrite() argument checking failed:"
@@ -162,9 +164,8 @@ ORVNEBU_API uint32_t ORVNEBU_CALL OrvNebu_burstSlaveWrite(uint32_t handle, ORV_S
 }
 
 ORVNEBU_API uint32_t ORVNEBU_CALL OrvNebu_broadcastSingleWrite(uint32_t handle, uint32_t device,
-                                                               uint32_t userChain,
-                                                               uint32_t address, uint32_t value,
-                                                               uint32_t* status) {
+                                                               uint32_t userChain, uint32_t address,
+                                                               uint32_t value, uint32_t* status) {
     return onBus(handle, device, userChain, [&](OrvNebu_Transaction& bus) {
         bus.broadcastSingleWrite(handle, device, userChain, address, value, status);
     });

@@ -84,8 +84,8 @@ uint32_t OrvNebu_BusList::discoverBus(uint32_t handle, uint32_t device, uint32_t
             Orv_CoreComm::getCoreStatus(handle, ORV_CORE_REF{device, userChain, coreIndex}, &info,
                                         status, status.getSize() * 8);
             if (info.word[1] == OrvNebu_PivoTransaction::MASTER_CORE_TYPE) {
-                slaveCount = static_cast<uint32_t>(
-                    status.getBits(SLAVE_COUNT_FIRST_BIT, SLAVE_COUNT_BITS));
+                slaveCount =
+                    static_cast<uint32_t>(status.getBits(SLAVE_COUNT_FIRST_BIT, SLAVE_COUNT_BITS));
                 masterIndex = coreIndex;
                 kind = BusKind::Pivo;
                 break;
@@ -111,8 +111,7 @@ uint32_t OrvNebu_BusList::discoverBus(uint32_t handle, uint32_t device, uint32_t
     return found;
 }
 
-OrvNebu_Transaction* OrvNebu_BusList::getBus(uint32_t handle, uint32_t device,
-                                             uint32_t userChain) {
+OrvNebu_Transaction* OrvNebu_BusList::getBus(uint32_t handle, uint32_t device, uint32_t userChain) {
     if (OrvNebu_Transaction* bus = findBus(handle, device, userChain)) return bus;
     if (discoverBus(handle, device, userChain) == 0)
         throw std::logic_error(busMessage("Invalid NEBU Bus Device:", device, userChain));

@@ -23,7 +23,8 @@ const char* const MSG_INVALID_SLAVE_INDEX =
     "Invalid slave index (Slave Index >= Maximum Slaves Supported).\n";
 const char* const MSG_INVALID_BURST_LENGTH =
     "Invalid burst length (Word Count > Maximum Burst Length 131071).\n";
-const char* const MSG_INVALID_ADDRESS = "Invalid bus address (Address > Maximum Address 0x1FFFF).\n";
+const char* const MSG_INVALID_ADDRESS =
+    "Invalid bus address (Address > Maximum Address 0x1FFFF).\n";
 const char* const KEY_DCLK_HAS_RESET = "dclk_has_reset";
 
 // Bursts up to this many words run on stack buffers; longer ones allocate once.
@@ -33,7 +34,9 @@ inline void setBit(uint8_t* bytes, uint32_t bit) {
     bytes[bit / 8] = static_cast<uint8_t>(bytes[bit / 8] | (1u << (bit % 8)));
 }
 
-inline uint32_t getBit(const uint8_t* bytes, uint32_t bit) { return (bytes[bit / 8] >> (bit % 8)) & 1u; }
+inline uint32_t getBit(const uint8_t* bytes, uint32_t bit) {
+    return (bytes[bit / 8] >> (bit % 8)) & 1u;
+}
 
 // A host map that is deleted on every path out of the scope.
 class TemporaryHostMap {
@@ -89,7 +92,8 @@ void OrvNebu_PivoTransaction::getBusErrorStatus(uint32_t handle, uint32_t, uint3
     uint8_t bits[CONTROL_BYTES] = {};
     readErrorBits(handle, bits, slaveCount_ + 2);
     const uint32_t busBits = bits[0] & 3u;
-    for (uint32_t i = 0; i < slaveCount_; ++i) errorStatus[i] = (getBit(bits, i + 2) << 2) | busBits;
+    for (uint32_t i = 0; i < slaveCount_; ++i)
+        errorStatus[i] = (getBit(bits, i + 2) << 2) | busBits;
 }
 
 void OrvNebu_PivoTransaction::clearBusErrorStatus(uint32_t handle, uint32_t device,
@@ -198,8 +202,7 @@ void OrvNebu_PivoTransaction::singleSlaveRead(uint32_t handle, ORV_SLAVE_REF sla
 }
 
 void OrvNebu_PivoTransaction::singleSlaveWrite(uint32_t handle, ORV_SLAVE_REF slaveRef,
-                                               uint32_t address, uint32_t value,
-                                               uint32_t* status) {
+                                               uint32_t address, uint32_t value, uint32_t* status) {
     checkTransfer(slaveRef, address);
     writeTransferControl(handle, 0, false, false, false, slaveRef.slaveIndex);
     writeAddress(handle, true, address);
@@ -226,8 +229,7 @@ void OrvNebu_PivoTransaction::singleSlaveWriteAndInspect(uint32_t handle, ORV_SL
 
 void OrvNebu_PivoTransaction::burstSlaveRead(uint32_t handle, ORV_SLAVE_REF slaveRef,
                                              uint32_t address, uint32_t incrAddress,
-                                             uint32_t* buffer, uint32_t numRead,
-                                             uint32_t* status) {
+                                             uint32_t* buffer, uint32_t numRead, uint32_t* status) {
     checkTransfer(slaveRef, address);
     checkBurstCount(numRead);
     writeTransferControl(handle, numRead, true, incrAddress != 0, false, slaveRef.slaveIndex);
@@ -336,7 +338,8 @@ void OrvNebu_PivoTransaction::readBurstData(uint32_t handle, uint32_t* words, ui
     }
     runCommand(handle, CMD_DATA, nullptr, bytes, count * 16);
     for (uint32_t i = 0; i < count; ++i)
-        words[i] = static_cast<uint32_t>(bytes[2 * i]) | (static_cast<uint32_t>(bytes[2 * i + 1]) << 8);
+        words[i] =
+            static_cast<uint32_t>(bytes[2 * i]) | (static_cast<uint32_t>(bytes[2 * i + 1]) << 8);
 }
 
 void OrvNebu_PivoTransaction::accessClockControl(uint32_t handle, uint32_t value, uint32_t* locked,

@@ -52,8 +52,8 @@ public:
     void enableSlave(uint32_t handle, ORV_SLAVE_REF slaveRef) override;
     void singleSlaveRead(uint32_t handle, ORV_SLAVE_REF slaveRef, uint32_t address,
                          uint32_t* buffer, uint32_t* status) override;
-    void singleSlaveWrite(uint32_t handle, ORV_SLAVE_REF slaveRef, uint32_t address,
-                          uint32_t value, uint32_t* status) override;
+    void singleSlaveWrite(uint32_t handle, ORV_SLAVE_REF slaveRef, uint32_t address, uint32_t value,
+                          uint32_t* status) override;
     void singleSlaveReadModifyWrite(uint32_t handle, ORV_SLAVE_REF slaveRef, uint32_t address,
                                     uint32_t value, uint32_t mask, uint32_t* status) override;
     void singleSlaveWriteAndInspect(uint32_t handle, ORV_SLAVE_REF slaveRef, uint32_t address,
@@ -91,11 +91,9 @@ public:
     virtual void accessClockControl(uint32_t handle, uint32_t value, uint32_t* locked,
                                     uint32_t* notRunning, bool write);
     // Sends the low bitCount (<= 32) bits of value.
-    virtual uint32_t writeCommand(uint32_t handle, uint32_t cmd, uint32_t value,
-                                  uint32_t bitCount);
+    virtual uint32_t writeCommand(uint32_t handle, uint32_t cmd, uint32_t value, uint32_t bitCount);
     // Receives bitCount (<= 32) bits into *value.
-    virtual uint32_t readCommand(uint32_t handle, uint32_t cmd, uint32_t* value,
-                                 uint32_t bitCount);
+    virtual uint32_t readCommand(uint32_t handle, uint32_t cmd, uint32_t* value, uint32_t bitCount);
 
     const ORV_CORE_REF& getCoreRef() const { return coreRef_; }
 

@@ -40,7 +40,8 @@ std::vector<Call> badArgumentCalls() {
         {"getSlaveHandles (null)",
          [](uint32_t c) { return OrvNebu_getSlaveHandles(H, 0, c, nullptr, 3); },
          "OrvNebu_getSlaveHandles() argument checking failed:(slaveHandles != 0) && (count != 0)"},
-        {"getSlaveHandles (0)", [](uint32_t c) { return OrvNebu_getSlaveHandles(H, 0, c, words, 0); },
+        {"getSlaveHandles (0)",
+         [](uint32_t c) { return OrvNebu_getSlaveHandles(H, 0, c, words, 0); },
          "OrvNebu_getSlaveHandles() argument checking failed:(slaveHandles != 0) && (count != 0)"},
         {"getBusErrorStatus (null)",
          [](uint32_t c) { return OrvNebu_getBusErrorStatus(H, 0, c, nullptr, 2); },
@@ -51,10 +52,14 @@ std::vector<Call> badArgumentCalls() {
          "OrvNebu_getBusErrorStatus() argument checking failed:(errorStatus != 0) && "
          "(errorStatusLen != 0)"},
         {"testSlaveInterface",
-         [](uint32_t c) { return OrvNebu_testSlaveInterface(H, {0, c, 0}, nullptr); },
+         [](uint32_t c) {
+             return OrvNebu_testSlaveInterface(H, {0, c, 0}, nullptr);
+         },
          "OrvNebu_testSlaveInterface() argument checking failed:result != 0"},
         {"singleSlaveRead",
-         [](uint32_t c) { return OrvNebu_singleSlaveRead(H, {0, c, 0}, 0x10, nullptr, words); },
+         [](uint32_t c) {
+             return OrvNebu_singleSlaveRead(H, {0, c, 0}, 0x10, nullptr, words);
+         },
          "OrvNebu_singleSlaveRead() argument checking failed:buffer != 0"},
         {"singleSlaveWriteAndInspect",
          [](uint32_t c) {
@@ -62,19 +67,29 @@ std::vector<Call> badArgumentCalls() {
          },
          "OrvNebu_singleSlaveWriteAndInspect() argument checking failed:rdBuf != 0"},
         {"burstSlaveRead (null)",
-         [](uint32_t c) { return OrvNebu_burstSlaveRead(H, {0, c, 0}, 0, 1, nullptr, 2, nullptr); },
+         [](uint32_t c) {
+             return OrvNebu_burstSlaveRead(H, {0, c, 0}, 0, 1, nullptr, 2, nullptr);
+         },
          "OrvNebu_burstSlaveRead() argument checking failed:(buffer != 0) && (numRead != 0)"},
         {"burstSlaveRead (0)",
-         [](uint32_t c) { return OrvNebu_burstSlaveRead(H, {0, c, 0}, 0, 1, words, 0, nullptr); },
+         [](uint32_t c) {
+             return OrvNebu_burstSlaveRead(H, {0, c, 0}, 0, 1, words, 0, nullptr);
+         },
          "OrvNebu_burstSlaveRead() argument checking failed:(buffer != 0) && (numRead != 0)"},
         {"burstSlaveRead (null, 0)",
-         [](uint32_t c) { return OrvNebu_burstSlaveRead(H, {0, c, 0}, 0, 1, nullptr, 0, nullptr); },
+         [](uint32_t c) {
+             return OrvNebu_burstSlaveRead(H, {0, c, 0}, 0, 1, nullptr, 0, nullptr);
+         },
          "OrvNebu_burstSlaveRead() argument checking failed:(buffer != 0) && (numRead != 0)"},
         {"burstSlaveWrite (null)",
-         [](uint32_t c) { return OrvNebu_burstSlaveWrite(H, {0, c, 0}, 0, 1, nullptr, 2, nullptr); },
+         [](uint32_t c) {
+             return OrvNebu_burstSlaveWrite(H, {0, c, 0}, 0, 1, nullptr, 2, nullptr);
+         },
          "OrvNebu_burstSlaveWrite() argument checking failed:(buffer != 0) && (numWrite != 0)"},
         {"burstSlaveWrite (0)",
-         [](uint32_t c) { return OrvNebu_burstSlaveWrite(H, {0, c, 0}, 0, 1, words, 0, nullptr); },
+         [](uint32_t c) {
+             return OrvNebu_burstSlaveWrite(H, {0, c, 0}, 0, 1, words, 0, nullptr);
+         },
          "OrvNebu_burstSlaveWrite() argument checking failed:(buffer != 0) && (numWrite != 0)"},
     };
 }
@@ -119,11 +134,21 @@ TEST_F(BusCallsTest, CallsWithoutChecksReportOnlyTheUnknownBus) {
     const std::vector<std::function<uint32_t()>> calls = {
         [] { return OrvNebu_clearBusErrorStatus(H, 0, 9); },
         [] { return OrvNebu_resetBus(H, 0, 9); },
-        [] { return OrvNebu_resetSlave(H, {0, 9, 0}); },
-        [] { return OrvNebu_disableSlave(H, {0, 9, 0}); },
-        [] { return OrvNebu_enableSlave(H, {0, 9, 0}); },
-        [] { return OrvNebu_singleSlaveWrite(H, {0, 9, 0}, 0, 0, nullptr); },
-        [] { return OrvNebu_singleSlaveReadModifyWrite(H, {0, 9, 0}, 0, 0, 0, nullptr); },
+        [] {
+            return OrvNebu_resetSlave(H, {0, 9, 0});
+        },
+        [] {
+            return OrvNebu_disableSlave(H, {0, 9, 0});
+        },
+        [] {
+            return OrvNebu_enableSlave(H, {0, 9, 0});
+        },
+        [] {
+            return OrvNebu_singleSlaveWrite(H, {0, 9, 0}, 0, 0, nullptr);
+        },
+        [] {
+            return OrvNebu_singleSlaveReadModifyWrite(H, {0, 9, 0}, 0, 0, 0, nullptr);
+        },
         [] { return OrvNebu_broadcastSingleWrite(H, 0, 9, 0, 0, nullptr); },
     };
     for (size_t i = 0; i < calls.size(); ++i) {

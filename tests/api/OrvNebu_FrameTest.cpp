@@ -29,8 +29,8 @@ TEST_F(FrameTest, ExceptionsBecomeOneMessageWithTheirSeverity) {
     };
     const Case cases[] = {
         {"abort", [] { throw OrvRT::Orv_AbortException(); }, 32768, "Orv abort command"},
-        {"abort text in a plain logic error",
-         [] { throw std::logic_error("Orv abort command"); }, 32768, "Orv abort command"},
+        {"abort text in a plain logic error", [] { throw std::logic_error("Orv abort command"); },
+         32768, "Orv abort command"},
         {"longer text", [] { throw std::logic_error("Orv abort command."); }, 256,
          "Orv abort command."},
         {"shorter text", [] { throw std::runtime_error("Orv abort"); }, 256, "Orv abort"},
@@ -65,20 +65,21 @@ TEST_F(FrameTest, ExceptionsBecomeOneMessageWithTheirSeverity) {
 TEST_F(FrameTest, TheLockIsHeldForTheBodyAndReleasedBeforeTheMessage) {
     // Another thread trying the lock: it fails while this thread holds it.
     auto otherThreadGetsLock = [] {
-        return std::async(std::launch::async, [] {
-                   try {
-                       OrvRT::OrvJtagTargetLock lock(5, 50);
-                       return true;
-                   } catch (const std::exception&) {
-                       return false;
-                   }
-               }).get();
+        return std::async(std::launch::async,
+                          [] {
+                              try {
+                                  OrvRT::OrvJtagTargetLock lock(5, 50);
+                                  return true;
+                              } catch (const std::exception&) {
+                                  return false;
+                              }
+                          })
+            .get();
     };
     bool duringBody = true;
     bool duringMessage = false;
-    OrvSim::setMessageSink([&](uint32_t, uint32_t, const std::string&) {
-        duringMessage = otherThreadGetsLock();
-    });
+    OrvSim::setMessageSink(
+        [&](uint32_t, uint32_t, const std::string&) { duringMessage = otherThreadGetsLock(); });
     EXPECT_EQ(lockedFrame(5,
                           [&] {
                               duringBody = otherThreadGetsLock();

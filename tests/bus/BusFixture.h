@@ -53,7 +53,8 @@ protected:
     std::string joined() const {
         std::string all;
         for (const auto& line : trace()) all += line + "\n";
-        for (const auto& m : messages()) all += "message " + std::to_string(m.severity) + ": " + m.text + "\n";
+        for (const auto& m : messages())
+            all += "message " + std::to_string(m.severity) + ": " + m.text + "\n";
         return all;
     }
 };

@@ -62,19 +62,19 @@ protected:
 
     size_t countLines(const std::string& prefix) const {
         const auto lines = jtag();
-        return static_cast<size_t>(std::count_if(lines.begin(), lines.end(), [&](const std::string& l) {
-            return l.rfind(prefix, 0) == 0;
-        }));
+        return static_cast<size_t>(
+            std::count_if(lines.begin(), lines.end(),
+                          [&](const std::string& l) { return l.rfind(prefix, 0) == 0; }));
     }
 };
 
 TEST_F(BusListTest, DiscoveryFindsTheMasterCountsItsSlavesAndResetsTheBus) {
     EXPECT_EQ(slaveCount(1, 0, 1), 4u);
-    EXPECT_THAT(jtag(), ElementsAre("jtag status device=0 chain=1 core=0 type=3",
-                                    "jtag status device=0 chain=1 core=1 type=14",
-                                    "jtag status device=0 chain=1 core=1 type=14",
-                                    jtagWrite(1, 6, 0x3F), jtagWrite(1, 6, 0x3E),
-                                    jtagRead(2, 4, 0x2), jtagWrite(1, 6, 0x00)));
+    EXPECT_THAT(jtag(),
+                ElementsAre("jtag status device=0 chain=1 core=0 type=3",
+                            "jtag status device=0 chain=1 core=1 type=14",
+                            "jtag status device=0 chain=1 core=1 type=14", jtagWrite(1, 6, 0x3F),
+                            jtagWrite(1, 6, 0x3E), jtagRead(2, 4, 0x2), jtagWrite(1, 6, 0x00)));
     EXPECT_TRUE(messages().empty());
 
     // The bus is now known: no more device access to find it.

@@ -71,10 +71,10 @@ protected:
 TEST_F(PivoTransactionTest, BusResetPulsesTheClockThenStrobesEveryBit) {
     discover(1);
     ASSERT_EQ(OrvNebu_resetBus(H, 0, 1), 0u);
-    EXPECT_THAT(jtag(), ElementsAre("jtag status device=0 chain=1 core=1 type=14",
-                                    jtagWrite(7, 4, 1), jtagWrite(7, 4, 0), jtagRead(7, 3, 0x2),
-                                    jtagWrite(1, 6, 0x3F), jtagWrite(1, 6, 0x3E),
-                                    jtagRead(2, 4, 0x2), jtagWrite(1, 6, 0x00)));
+    EXPECT_THAT(jtag(),
+                ElementsAre("jtag status device=0 chain=1 core=1 type=14", jtagWrite(7, 4, 1),
+                            jtagWrite(7, 4, 0), jtagRead(7, 3, 0x2), jtagWrite(1, 6, 0x3F),
+                            jtagWrite(1, 6, 0x3E), jtagRead(2, 4, 0x2), jtagWrite(1, 6, 0x00)));
     EXPECT_TRUE(messages().empty());
 
     // Clearing the error status is the same complete reset.
@@ -87,9 +87,9 @@ TEST_F(PivoTransactionTest, BusResetPulsesTheClockThenStrobesEveryBit) {
 TEST_F(PivoTransactionTest, BusResetWithoutClockResetSendsNoClockCommand) {
     discover(2);
     ASSERT_EQ(OrvNebu_resetBus(H, 0, 2), 0u);
-    EXPECT_THAT(jtag(), ElementsAre("jtag status device=0 chain=2 core=0 type=14",
-                                    jtagWrite(1, 4, 0xF), jtagWrite(1, 4, 0xE), jtagRead(2, 4, 0x2),
-                                    jtagWrite(1, 4, 0x0)));
+    EXPECT_THAT(jtag(),
+                ElementsAre("jtag status device=0 chain=2 core=0 type=14", jtagWrite(1, 4, 0xF),
+                            jtagWrite(1, 4, 0xE), jtagRead(2, 4, 0x2), jtagWrite(1, 4, 0x0)));
 }
 
 TEST_F(PivoTransactionTest, ResetTimeoutZeroesTheControlWordAfterElevenPolls) {
@@ -174,9 +174,9 @@ TEST_F(PivoTransactionTest, SingleTransfersLayOutControlAddressAndData) {
 
     clearLog();
     ASSERT_EQ(OrvNebu_singleSlaveWrite(H, slave(1, 3), 0x1FFFF, 0xFFFF1234u, nullptr), 0u);
-    EXPECT_THAT(jtag(), ElementsAre(jtagWrite(4, 29, control(0, false, false, false, 3)),
-                                    jtagWrite(5, 19, 0x3FFFF), jtagWrite(6, 18, 0x1234),
-                                    "jtag flush"));
+    EXPECT_THAT(jtag(),
+                ElementsAre(jtagWrite(4, 29, control(0, false, false, false, 3)),
+                            jtagWrite(5, 19, 0x3FFFF), jtagWrite(6, 18, 0x1234), "jtag flush"));
     EXPECT_EQ(board()->peek(0, 1, 3, 0x1FFFF), 0x1234);
 
     const OrvSim::JtagStats stats = OrvSim::takeStats(H);
@@ -188,10 +188,10 @@ TEST_F(PivoTransactionTest, ReadModifyWriteKeepsTheMaskedBits) {
     discover(1);
     ASSERT_EQ(OrvNebu_singleSlaveReadModifyWrite(H, slave(1, 0), 0x10, 0x12, 0xFF00, nullptr), 0u);
     EXPECT_EQ(board()->peek(0, 1, 0, 0x10), 0xAB12);
-    EXPECT_THAT(jtag(), ElementsAre(jtagWrite(4, 29, 0), jtagWrite(5, 19, 0x00010),
-                                    jtagRead(6, 16, 0xABCD), jtagWrite(4, 29, 0),
-                                    jtagWrite(5, 19, 0x20010), jtagWrite(6, 18, 0xAB12),
-                                    "jtag flush"));
+    EXPECT_THAT(jtag(),
+                ElementsAre(jtagWrite(4, 29, 0), jtagWrite(5, 19, 0x00010), jtagRead(6, 16, 0xABCD),
+                            jtagWrite(4, 29, 0), jtagWrite(5, 19, 0x20010),
+                            jtagWrite(6, 18, 0xAB12), "jtag flush"));
 
     // Write and inspect: the write, then the read-back of the same address.
     clearLog();
@@ -208,8 +208,8 @@ TEST_F(PivoTransactionTest, BurstsMoveSixteenBitsPerWord) {
     const uint32_t out[3] = {0x1111, 0xA2B2, 0xFFFF3333u};
     ASSERT_EQ(OrvNebu_burstSlaveWrite(H, slave(1, 3), 0x40, 1, out, 3, nullptr), 0u);
     EXPECT_THAT(jtag(), ElementsAre(jtagWrite(4, 29, control(3, true, true, false, 3)),
-                                    jtagWrite(5, 19, 0x20040),
-                                    jtagWrite(6, 50, 0x3333A2B21111ull), "jtag flush"));
+                                    jtagWrite(5, 19, 0x20040), jtagWrite(6, 50, 0x3333A2B21111ull),
+                                    "jtag flush"));
     EXPECT_EQ(OrvSim::takeStats(H).writeBits, 29u + 19u + 50u);
 
     clearLog();
@@ -263,7 +263,7 @@ TEST_F(PivoTransactionTest, WhatTheMasterCannotCarryIsRefusedBeforeAnythingIsSen
     ASSERT_EQ(sent.size(), 7u);
     const std::string burst = "Invalid burst length (Word Count > Maximum Burst Length 131071).\n";
     const std::string address = "Invalid bus address (Address > Maximum Address 0x1FFFF).\n";
-    const std::vector<std::string> expected = {burst,     burst,   BAD_INDEX, BAD_INDEX,
+    const std::vector<std::string> expected = {burst,   burst,   BAD_INDEX, BAD_INDEX,
                                                address, address, address};
     for (size_t i = 0; i < sent.size(); ++i) {
         EXPECT_EQ(sent[i].text, expected[i]) << i;
@@ -399,10 +399,10 @@ TEST_F(PivoTransactionTest, BusInfoComesFromTheMasterStatus) {
     (*info)["period_int"] = "old";
     (*info)["mine"] = "kept";
     ASSERT_EQ(OrvNebu_getBusInfo(H, 0, 1, &handle), 0u);
-    EXPECT_EQ(*info, (OrvRT::Orv_HashMapCStr{{"period_int", "10"},
-                                             {"period_frc", "5"},
-                                             {"dclk_has_reset", "1"},
-                                             {"mine", "kept"}}));
+    EXPECT_EQ(
+        *info,
+        (OrvRT::Orv_HashMapCStr{
+            {"period_int", "10"}, {"period_frc", "5"}, {"dclk_has_reset", "1"}, {"mine", "kept"}}));
     EXPECT_THAT(jtag(), ElementsAre("jtag status device=0 chain=1 core=1 type=14"));
     OrvContainer_hashmapCStr_delete(handle);
 }
