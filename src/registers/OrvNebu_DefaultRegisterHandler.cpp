@@ -105,7 +105,7 @@ void OrvNebu_DefaultRegisterHandler::getRegisters(uint32_t handle, const ORV_SLA
     bus->burstSlaveRead(handle, slaveRef, block.firstAddress, 1, block.words.data(), count,
                         nullptr);
     if (registers->empty()) {
-        for (const auto& entry : registerMap_) (*registers)[entry.first] = getValue(*entry.second, block);
+        for (const auto& entry : registerMap_) (*registers)[entry.first] = getValue(entry.second, block);
     } else {
         for (auto& entry : *registers) entry.second = getValue(*findRegisterMutable(entry.first), block);
     }

@@ -77,7 +77,7 @@ OrvNebu_RegisterHandler::Register* OrvNebu_RegisterHandler::findRegisterMutable(
     const std::string& name) const {
     if (name.empty()) return nullptr;
     auto it = registerMap_.find(name);
-    return it == registerMap_.end() ? nullptr : it->second.get();
+    return it == registerMap_.end() ? nullptr : const_cast<Register*>(&it->second);
 }
 
 void OrvNebu_RegisterHandler::readRegistersFromFile(uint32_t handle) {
@@ -120,64 +120,59 @@ bool OrvNebu_RegisterHandler::parseLine(uint32_t lineNumber, const std::string& 
     if (cols.size() < MIN_COLUMNS) return false;
     Orv_Util::unQuote(cols);
 
-    auto slice = std::make_unique<RegisterSlice>();
-    slice->address = Orv_NumberUtil::hexStr2UInt(cols[1]);
-    slice->order = static_cast<uint32_t>(OrvNebu_CsvText::decimalToInt32(cols[2]));
-    slice->startBit = static_cast<uint32_t>(OrvNebu_CsvText::decimalToInt32(cols[3]));
-    slice->endBit = static_cast<uint32_t>(OrvNebu_CsvText::decimalToInt32(cols[4]));
+    RegisterSlice slice;
+    slice.address = Orv_NumberUtil::hexStr2UInt(cols[1]);
+    slice.order = static_cast<uint32_t>(OrvNebu_CsvText::decimalToInt32(cols[2]));
+    slice.startBit = static_cast<uint32_t>(OrvNebu_CsvText::decimalToInt32(cols[3]));
+    slice.endBit = static_cast<uint32_t>(OrvNebu_CsvText::decimalToInt32(cols[4]));
     if (cols[8].find('n') != std::string::npos) return true;
 
     // A word has bits 0 to 31 and the bus 17 address bits: anything else cannot be moved.
-    if (slice->startBit > HIGHEST_WORD_BIT || slice->endBit > HIGHEST_WORD_BIT) {
+    if (slice.startBit > HIGHEST_WORD_BIT || slice.endBit > HIGHEST_WORD_BIT) {
         throw UnusableLine("Register bit out of range 0 to 31: start bit " + cols[3] +
                            ", end bit " + cols[4]);
     }
-    if (slice->address > MAX_BUS_ADDRESS) {
+    if (slice.address > MAX_BUS_ADDRESS) {
         throw UnusableLine("Register address out of range 0 to 1ffff: " + cols[1]);
     }
 
-    slice->registerName = cols[0];
-    slice->text6 = cols[5];
-    slice->readable = cols[6].find('r') != std::string::npos;
-    slice->writable = cols[6].find('w') != std::string::npos;
-    slice->text8 = cols[7];
-    slice->included = true;
-    if (cols.size() >= MIN_COLUMNS + 1) slice->trailer = line.substr(line.rfind(','));
+    slice.readable = cols[6].find('r') != std::string::npos;
+    slice.writable = cols[6].find('w') != std::string::npos;
+    slice.included = true;
+    if (cols.size() >= MIN_COLUMNS + 1) slice.trailer = line.substr(line.rfind(','));
+    slice.registerName = std::move(cols[0]);
+    slice.text6 = std::move(cols[5]);
+    slice.text8 = std::move(cols[7]);
+    slices_.push_back(std::move(slice));
+    RegisterSlice* s = &slices_.back();
 
-    RegisterSlice* s = slice.get();
     // A line without a name belongs to no register: it is kept for the file image only,
     // since no call can ever name it.
     if (!s->registerName.empty()) {
-        Register* reg = findRegisterMutable(s->registerName);
-        if (reg == nullptr) {
-            auto fresh = std::make_unique<Register>();
-            fresh->name = s->registerName;
-            reg = fresh.get();
-            registerMap_[s->registerName] = std::move(fresh);
-        }
+        Register& reg = registerMap_[s->registerName];
+        if (reg.slices.empty()) reg.name = s->registerName;
         auto pos = std::upper_bound(
-            reg->slices.begin(), reg->slices.end(), s->order,
+            reg.slices.begin(), reg.slices.end(), s->order,
             [](uint32_t order, const RegisterSlice* other) { return order < other->order; });
-        reg->slices.insert(pos, s);
-        reg->totalWidth += s->width();
-        reg->minAddress = std::min(reg->minAddress, s->address);
-        reg->maxAddress = std::max(reg->maxAddress, s->address);
+        reg.slices.insert(pos, s);
+        reg.totalWidth += s->width();
+        reg.minAddress = std::min(reg.minAddress, s->address);
+        reg.maxAddress = std::max(reg.maxAddress, s->address);
     }
     minAddress_ = std::min(minAddress_, s->address);
     maxAddress_ = std::max(maxAddress_, s->address);
-    slices_.push_back(std::move(slice));
     return true;
 }
 
 void OrvNebu_RegisterHandler::print(uint32_t handle, std::ostream& out) const {
     (void)handle;
     out << header_ << '\n' << std::flush;
-    for (const auto& s : slices_) {
-        out << s->registerName << ',';
-        if (s->address >= 10 && s->address <= 15) out << '0';
-        out << hexText(s->address) << ',' << s->order << ',' << s->startBit << ',' << s->endBit
-            << ',' << s->text6 << ',' << (s->readable ? "r" : "") << (s->writable ? "w" : "")
-            << ',' << s->text8 << ',' << (s->included ? "y" : "n") << s->trailer << '\n'
+    for (const RegisterSlice& s : slices_) {
+        out << s.registerName << ',';
+        if (s.address >= 10 && s.address <= 15) out << '0';
+        out << hexText(s.address) << ',' << s.order << ',' << s.startBit << ',' << s.endBit
+            << ',' << s.text6 << ',' << (s.readable ? "r" : "") << (s.writable ? "w" : "")
+            << ',' << s.text8 << ',' << (s.included ? "y" : "n") << s.trailer << '\n'
             << std::flush;
     }
 }

@@ -4,6 +4,7 @@
 #pragma once
 
 #include <cstdint>
+#include <deque>
 #include <memory>
 #include <ostream>
 #include <string>
@@ -121,8 +122,10 @@ protected:
 
     std::string regFilename_;
     std::string header_;
-    std::vector<std::unique_ptr<RegisterSlice>> slices_;
-    std::unordered_map<std::string, std::unique_ptr<Register>> registerMap_;
+    // A deque keeps the slices where they are as it grows: registers point at them.
+    std::deque<RegisterSlice> slices_;
+    // Nodes stay put as the map grows, so slices may be reached through Register pointers.
+    std::unordered_map<std::string, Register> registerMap_;
     uint32_t minAddress_ = 0xFFFFFFFFu;
     uint32_t maxAddress_ = 0;
 

@@ -83,7 +83,7 @@ void OrvNebu_SingleRegisterHandler::getRegisters(uint32_t handle, const ORV_SLAV
         OrvNebu_BusList::getBusList()->getBus(handle, slaveRef.device, slaveRef.userChain);
     if (registers->empty()) {
         for (const auto& entry : registerMap_) {
-            (*registers)[entry.first] = getValue(handle, slaveRef, *bus, *entry.second);
+            (*registers)[entry.first] = getValue(handle, slaveRef, *bus, entry.second);
         }
         return;
     }
