@@ -53,46 +53,69 @@ void BM_ParseRegisterFile(benchmark::State& state) {
 }
 BENCHMARK(BM_ParseRegisterFile)->Unit(benchmark::kMillisecond);
 
+// A host with one slave of a file of fileRegisters registers, and a map naming n of them.
+class SlaveSetup {
+public:
+    SlaveSetup(uint32_t n, uint32_t fileRegisters) : dir_(tempDir()) {
+        writeRegisterFile(dir_, "regs.csv", fileRegisters);
+        std::ofstream(dir_ + "orvnebu_directory.csv")
+            << "slave_type,orv_drv_ver_min,orv_drv_ver_max,registers,parameters\n"
+               "0x11,1,0xFFFF,regs.csv,\n";
+        OrvSim::resetHost();
+        OrvSim::setBoard(OrvSim::Board::loadText(
+            R"({ "devices": [ { "chains": { "1": { "cores": [ { "type": 3 }, { "type": 14,
+                 "master": { "slaveCount": 2, "slaves": { "0": { "slaveType": "0x11",
+                 "driverVersion": 1 } } } } ] } } } ] })",
+            "bench board"));
+        OrvSim::setDataDir(dir_);
+        ok_ = OrvNebu_initialize(1, ref_) == ORVNEBU_OK;
+        map_ = OrvContainer_hashmapCStr_new();
+        auto& m = *static_cast<OrvRT::Orv_HashMapCStr*>(map_);
+        for (uint32_t i = 0; i < n; ++i) m["REG_" + std::to_string(i)] = "5A";
+        OrvSim::takeStats(1);
+    }
+    ~SlaveSetup() {
+        OrvContainer_hashmapCStr_delete(map_);
+        OrvNebu_terminate(1, ref_);
+        OrvSim::resetHost();
+        std::filesystem::remove_all(dir_);
+    }
+    bool ok() const { return ok_; }
+    ORV_HASHMAP_HANDLE* map() { return &map_; }
+    const ORV_SLAVE_REF& ref() const { return ref_; }
+
+    // JTAG cost per call of the measured loop.
+    void count(benchmark::State& state) {
+        OrvSim::JtagStats s = OrvSim::takeStats(1);
+        const double calls = static_cast<double>(state.iterations());
+        state.counters["roundTrips/call"] = static_cast<double>(s.roundTrips) / calls;
+        state.counters["flushes/call"] = static_cast<double>(s.flushes) / calls;
+        state.counters["commands/call"] = static_cast<double>(s.commands) / calls;
+        state.counters["readBits/call"] = static_cast<double>(s.readBits) / calls;
+        state.counters["writeBits/call"] = static_cast<double>(s.writeBits) / calls;
+    }
+
+private:
+    std::string dir_;
+    ORV_SLAVE_REF ref_{0, 1, 0};
+    ORV_HASHMAP_HANDLE map_ = nullptr;
+    bool ok_ = false;
+};
+
 // getRegisters of n registers of a file of fileRegisters registers (args: n, fileRegisters).
 void BM_GetRegisters(benchmark::State& state) {
-    const uint32_t n = static_cast<uint32_t>(state.range(0));
-    const uint32_t fileRegisters = static_cast<uint32_t>(state.range(1));
-    const std::string dir = tempDir();
-    writeRegisterFile(dir, "regs.csv", fileRegisters);
-    std::ofstream(dir + "orvnebu_directory.csv")
-        << "slave_type,orv_drv_ver_min,orv_drv_ver_max,registers,parameters\n"
-           "0x11,1,0xFFFF,regs.csv,\n";
-    OrvSim::resetHost();
-    OrvSim::setBoard(OrvSim::Board::loadText(
-        R"({ "devices": [ { "chains": { "1": { "cores": [ { "type": 3 }, { "type": 14,
-             "master": { "slaveCount": 2, "slaves": { "0": { "slaveType": "0x11",
-             "driverVersion": 1 } } } } ] } } } ] })",
-        "bench board"));
-    OrvSim::setDataDir(dir);
-    const ORV_SLAVE_REF ref{0, 1, 0};
-    if (OrvNebu_initialize(1, ref) != ORVNEBU_OK) {
+    SlaveSetup setup(static_cast<uint32_t>(state.range(0)), static_cast<uint32_t>(state.range(1)));
+    if (!setup.ok()) {
         state.SkipWithError("initialize failed");
         return;
     }
-    ORV_HASHMAP_HANDLE map = OrvContainer_hashmapCStr_new();
-    auto& m = *static_cast<OrvRT::Orv_HashMapCStr*>(map);
-    for (uint32_t i = 0; i < n; ++i) m["REG_" + std::to_string(i)] = "";
-    OrvSim::takeStats(1);
     for (auto _ : state) {
-        if (OrvNebu_getRegisters(1, ref, &map) != ORVNEBU_OK) {
+        if (OrvNebu_getRegisters(1, setup.ref(), setup.map()) != ORVNEBU_OK) {
             state.SkipWithError("getRegisters failed");
             break;
         }
     }
-    OrvSim::JtagStats s = OrvSim::takeStats(1);
-    const double calls = static_cast<double>(state.iterations());
-    state.counters["roundTrips/call"] = static_cast<double>(s.roundTrips) / calls;
-    state.counters["commands/call"] = static_cast<double>(s.commands) / calls;
-    state.counters["readBits/call"] = static_cast<double>(s.readBits) / calls;
-    OrvContainer_hashmapCStr_delete(map);
-    OrvNebu_terminate(1, ref);
-    OrvSim::resetHost();
-    std::filesystem::remove_all(dir);
+    setup.count(state);
 }
 BENCHMARK(BM_GetRegisters)
     ->Args({1, 100})
@@ -101,6 +124,24 @@ BENCHMARK(BM_GetRegisters)
     ->Args({1, 5000})
     ->Args({10, 5000})
     ->Args({100, 5000})
+    ->Unit(benchmark::kMicrosecond);
+
+// setRegisters of n registers (args: n, fileRegisters).
+void BM_SetRegisters(benchmark::State& state) {
+    SlaveSetup setup(static_cast<uint32_t>(state.range(0)), static_cast<uint32_t>(state.range(1)));
+    if (!setup.ok()) {
+        state.SkipWithError("initialize failed");
+        return;
+    }
+    for (auto _ : state) {
+        if (OrvNebu_setRegisters(1, setup.ref(), setup.map()) != ORVNEBU_OK) {
+            state.SkipWithError("setRegisters failed");
+            break;
+        }
+    }
+    setup.count(state);
+}
+BENCHMARK(BM_SetRegisters)->Args({1, 100})->Args({10, 100})->Args({100, 100})
     ->Unit(benchmark::kMicrosecond);
 
 }  // namespace
