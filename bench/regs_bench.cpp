@@ -141,7 +141,10 @@ void BM_SetRegisters(benchmark::State& state) {
     }
     setup.count(state);
 }
-BENCHMARK(BM_SetRegisters)->Args({1, 100})->Args({10, 100})->Args({100, 100})
+BENCHMARK(BM_SetRegisters)
+    ->Args({1, 100})
+    ->Args({10, 100})
+    ->Args({100, 100})
     ->Unit(benchmark::kMicrosecond);
 
 }  // namespace

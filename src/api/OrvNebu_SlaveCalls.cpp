@@ -102,7 +102,8 @@ ORVNEBU_API uint32_t ORVNEBU_CALL OrvNebu_initialize(uint32_t handle, ORV_SLAVE_
             std::unique_ptr<void, MapDeleter> info(OrvContainer_hashmapCStr_new());
             ORV_HASHMAP_HANDLE infoHandle = info.get();
             if (OrvNebu_getSlaveInfo(handle, slaveRef, &infoHandle) != ORVNEBU_OK) {
-                throw std::logic_error(slaveText(slaveRef) + ", is not a valid OrvNebu Slave core.");
+                throw std::logic_error(slaveText(slaveRef) +
+                                       ", is not a valid OrvNebu Slave core.");
             }
             slave = OrvNebu_SlaveFactory::create(handle, slaveRef, mapOf(&infoHandle));
         }
@@ -144,8 +145,8 @@ ORVNEBU_API uint32_t ORVNEBU_CALL OrvNebu_read(uint32_t handle, ORV_SLAVE_REF sl
         if (size == 1) {
             innerRc = OrvNebu_singleSlaveRead(handle, slaveRef, address, &words[0], nullptr);
         } else {
-            innerRc = OrvNebu_burstSlaveRead(handle, slaveRef, address, 1, words.data(), size,
-                                             nullptr);
+            innerRc =
+                OrvNebu_burstSlaveRead(handle, slaveRef, address, 1, words.data(), size, nullptr);
         }
         static const char* const DIGITS = "0123456789ABCDEF";
         char* out = data;
@@ -162,8 +163,7 @@ ORVNEBU_API uint32_t ORVNEBU_CALL OrvNebu_read(uint32_t handle, ORV_SLAVE_REF sl
 }
 
 ORVNEBU_API uint32_t ORVNEBU_CALL OrvNebu_write(uint32_t handle, ORV_SLAVE_REF slaveRef,
-                                                uint32_t address, uint32_t size,
-                                                const char* data) {
+                                                uint32_t address, uint32_t size, const char* data) {
     uint32_t innerRc = ORVNEBU_OK;
     uint32_t rc = lockedFrame(handle, [&] {
         checkArgument(data != nullptr && size != 0,
@@ -185,8 +185,8 @@ ORVNEBU_API uint32_t ORVNEBU_CALL OrvNebu_write(uint32_t handle, ORV_SLAVE_REF s
         if (size == 1) {
             innerRc = OrvNebu_singleSlaveWrite(handle, slaveRef, address, words[0], nullptr);
         } else {
-            innerRc = OrvNebu_burstSlaveWrite(handle, slaveRef, address, 1, words.data(), size,
-                                              nullptr);
+            innerRc =
+                OrvNebu_burstSlaveWrite(handle, slaveRef, address, 1, words.data(), size, nullptr);
         }
     });
     return rc != ORVNEBU_OK ? rc : innerRc;

@@ -47,8 +47,7 @@ void OrvNebu_DefaultRegisterHandler::readAndPrint(uint32_t handle, const std::st
     handler.print(handle, out);
 }
 
-void OrvNebu_DefaultRegisterHandler::getAddressRange(uint32_t* firstAddress,
-                                                     uint32_t* lastAddress,
+void OrvNebu_DefaultRegisterHandler::getAddressRange(uint32_t* firstAddress, uint32_t* lastAddress,
                                                      const Orv_HashMapCStr* registers) const {
     *firstAddress = 0xFFFFFFFFu;
     *lastAddress = 0;
@@ -60,8 +59,7 @@ void OrvNebu_DefaultRegisterHandler::getAddressRange(uint32_t* firstAddress,
     }
 }
 
-std::string OrvNebu_DefaultRegisterHandler::getValue(const Register& reg,
-                                                     const WordBlock& block) {
+std::string OrvNebu_DefaultRegisterHandler::getValue(const Register& reg, const WordBlock& block) {
     std::string digits;
     digits.reserve(reg.totalWidth);
     for (auto it = reg.slices.rbegin(); it != reg.slices.rend(); ++it) {
@@ -105,9 +103,11 @@ void OrvNebu_DefaultRegisterHandler::getRegisters(uint32_t handle, const ORV_SLA
     bus->burstSlaveRead(handle, slaveRef, block.firstAddress, 1, block.words.data(), count,
                         nullptr);
     if (registers->empty()) {
-        for (const auto& entry : registerMap_) (*registers)[entry.first] = getValue(entry.second, block);
+        for (const auto& entry : registerMap_)
+            (*registers)[entry.first] = getValue(entry.second, block);
     } else {
-        for (auto& entry : *registers) entry.second = getValue(*findRegisterMutable(entry.first), block);
+        for (auto& entry : *registers)
+            entry.second = getValue(*findRegisterMutable(entry.first), block);
     }
 }
 

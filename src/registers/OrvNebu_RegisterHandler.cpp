@@ -43,9 +43,11 @@ std::string hexText(uint32_t value) {
 void OrvNebu_RegisterHandler::RegisterSlice::appendDigits(uint32_t word,
                                                           std::string& digits) const {
     if (endBit >= startBit) {
-        for (uint32_t bit = endBit + 1; bit-- > startBit;) digits += ((word >> bit) & 1u) ? '1' : '0';
+        for (uint32_t bit = endBit + 1; bit-- > startBit;)
+            digits += ((word >> bit) & 1u) ? '1' : '0';
     } else {
-        for (uint32_t bit = endBit; bit <= startBit; ++bit) digits += ((word >> bit) & 1u) ? '1' : '0';
+        for (uint32_t bit = endBit; bit <= startBit; ++bit)
+            digits += ((word >> bit) & 1u) ? '1' : '0';
     }
 }
 
@@ -105,8 +107,8 @@ void OrvNebu_RegisterHandler::readRegistersFromFile(uint32_t handle) {
             OrvJtag_session_sendMessage(handle, SEVERITY_ERROR, e.what());
         }
         if (!parsed) {
-            std::string text = "Unable to parse file: " + fileName + " line:" +
-                               std::to_string(lineNumber) + ": " + line + "\n";
+            std::string text = "Unable to parse file: " + fileName +
+                               " line:" + std::to_string(lineNumber) + ": " + line + "\n";
             OrvJtag_session_sendMessage(handle, SEVERITY_MALFORMED_LINE, text.c_str());
             throw Orv_AbortException();
         }
@@ -170,9 +172,9 @@ void OrvNebu_RegisterHandler::print(uint32_t handle, std::ostream& out) const {
     for (const RegisterSlice& s : slices_) {
         out << s.registerName << ',';
         if (s.address >= 10 && s.address <= 15) out << '0';
-        out << hexText(s.address) << ',' << s.order << ',' << s.startBit << ',' << s.endBit
-            << ',' << s.text6 << ',' << (s.readable ? "r" : "") << (s.writable ? "w" : "")
-            << ',' << s.text8 << ',' << (s.included ? "y" : "n") << s.trailer << '\n'
+        out << hexText(s.address) << ',' << s.order << ',' << s.startBit << ',' << s.endBit << ','
+            << s.text6 << ',' << (s.readable ? "r" : "") << (s.writable ? "w" : "") << ','
+            << s.text8 << ',' << (s.included ? "y" : "n") << s.trailer << '\n'
             << std::flush;
     }
 }

@@ -37,7 +37,9 @@ public:
         bool included = true;
         std::string trailer;  // ",..." from the line's last comma when it has 10+ columns
 
-        uint32_t width() const { return (endBit > startBit ? endBit - startBit : startBit - endBit) + 1; }
+        uint32_t width() const {
+            return (endBit > startBit ? endBit - startBit : startBit - endBit) + 1;
+        }
         // Appends the slice's digits taken from word: bit endBit first, bit startBit last.
         void appendDigits(uint32_t word, std::string& digits) const;
         // Takes width() digits from digits[pos...] into value bits and clears their bits in

@@ -47,10 +47,8 @@ void OrvNebu_SingleRegisterHandler::readAndPrint(uint32_t handle, const std::str
     handler.print(handle, out);
 }
 
-std::string OrvNebu_SingleRegisterHandler::getValue(uint32_t handle,
-                                                    const ORV_SLAVE_REF& slaveRef,
-                                                    OrvNebu_Transaction& bus,
-                                                    const Register& reg) {
+std::string OrvNebu_SingleRegisterHandler::getValue(uint32_t handle, const ORV_SLAVE_REF& slaveRef,
+                                                    OrvNebu_Transaction& bus, const Register& reg) {
     std::string digits;
     digits.reserve(reg.totalWidth);
     for (auto it = reg.slices.rbegin(); it != reg.slices.rend(); ++it) {

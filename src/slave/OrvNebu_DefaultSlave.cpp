@@ -95,8 +95,7 @@ OrvNebu_ParamAction* OrvNebu_DefaultSlave::getParamAction(const std::string& nam
     return it == actions_.end() ? nullptr : it->second;
 }
 
-void OrvNebu_DefaultSlave::setParametersInRegisterHashMap(uint32_t handle,
-                                                          Orv_HashMapCStr* params,
+void OrvNebu_DefaultSlave::setParametersInRegisterHashMap(uint32_t handle, Orv_HashMapCStr* params,
                                                           Orv_HashMapCStr* registers) {
     (void)registers;
     OrvNebu_Slave::setParameters(handle, getSlaveRef(), params);

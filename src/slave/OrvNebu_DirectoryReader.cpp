@@ -94,8 +94,8 @@ bool OrvNebu_DirectoryReader::getResult(Orv_HashMapCStr& entry) {
             if (parseLine(lineNumber, line, entry)) return true;
         } catch (const std::exception& e) {
             OrvJtag_session_sendMessage(handle_, SEVERITY_ERROR, e.what());
-            std::string text = "Unable to parse file: " + fileName_ + " line:" +
-                               std::to_string(lineNumber) + ": " + line;
+            std::string text = "Unable to parse file: " + fileName_ +
+                               " line:" + std::to_string(lineNumber) + ": " + line;
             OrvJtag_session_sendMessage(handle_, SEVERITY_ERROR, text.c_str());
             throw Orv_AbortException();
         }

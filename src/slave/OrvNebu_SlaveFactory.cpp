@@ -50,11 +50,10 @@ OrvNebu_SlaveFactory::CreateFunction OrvNebu_SlaveFactory::findCreateFunction(
     const CreationRecord* begin = std::begin(CREATION_RECORDS);
     const CreationRecord* end = std::end(CREATION_RECORDS);
     // The first record past the type, or of the type with a maximum version reaching V.
-    const CreationRecord* it = std::lower_bound(
-        begin, end, 0, [&](const CreationRecord& r, int) {
-            return r.slaveType < slaveType ||
-                   (r.slaveType == slaveType && r.maxDriverVersion < driverVersion);
-        });
+    const CreationRecord* it = std::lower_bound(begin, end, 0, [&](const CreationRecord& r, int) {
+        return r.slaveType < slaveType ||
+               (r.slaveType == slaveType && r.maxDriverVersion < driverVersion);
+    });
     if (it != end && it->slaveType == slaveType && it->minDriverVersion <= driverVersion &&
         it->maxDriverVersion >= driverVersion) {
         return it->create;

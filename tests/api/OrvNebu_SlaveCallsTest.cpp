@@ -193,8 +193,7 @@ TEST_F(SlaveCallsTest, RawCallsCheckTheirArguments) {
     EXPECT_EQ(OrvNebu_read(HANDLE, ref(1), 0, 1, nullptr), ORVNEBU_FAILED);
     EXPECT_LAST_MESSAGE(256, "OrvNebu_read() argument checking failed:(data != 0) && (size != 0)");
     EXPECT_EQ(OrvNebu_write(HANDLE, ref(1), 0, 2, nullptr), ORVNEBU_FAILED);
-    EXPECT_LAST_MESSAGE(256,
-                        "OrvNebu_write() argument checking failed:(data != 0) && (size != 0)");
+    EXPECT_LAST_MESSAGE(256, "OrvNebu_write() argument checking failed:(data != 0) && (size != 0)");
     EXPECT_EQ(OrvNebu_write(HANDLE, ref(1), 0, 2, "0002000"), ORVNEBU_FAILED);
     EXPECT_LAST_MESSAGE(256, "OrvNebu_write() argument checking failed:strlen(data) == (size*4)");
 
@@ -203,8 +202,7 @@ TEST_F(SlaveCallsTest, RawCallsCheckTheirArguments) {
     EXPECT_EQ(OrvNebu_read(HANDLE, ref(1), 0, 0x40000000u, text), ORVNEBU_FAILED);
     EXPECT_LAST_MESSAGE(256, "OrvNebu_read() argument checking failed:size*4+1 overflows 32 bits");
     EXPECT_EQ(OrvNebu_write(HANDLE, ref(1), 0, 0x40000000u, ""), ORVNEBU_FAILED);
-    EXPECT_LAST_MESSAGE(256,
-                        "OrvNebu_write() argument checking failed:size*4+1 overflows 32 bits");
+    EXPECT_LAST_MESSAGE(256, "OrvNebu_write() argument checking failed:size*4+1 overflows 32 bits");
     EXPECT_TRUE(trace().empty());
 
     // Text that is no hexadecimal number writes nothing.

@@ -28,8 +28,8 @@ protected:
     }
 
     std::string parseError(uint32_t line, const std::string& text) {
-        return "Unable to parse file: " + data_.path("regs.csv") + " line:" +
-               std::to_string(line) + ": " + text + "\n";
+        return "Unable to parse file: " + data_.path("regs.csv") + " line:" + std::to_string(line) +
+               ": " + text + "\n";
     }
 };
 
@@ -110,11 +110,10 @@ TEST_F(RegisterFileTest, ShortAndEmptyLinesAreParseErrorsWithTheirLineNumbers) {
 TEST_F(RegisterFileTest, BitsAndAddressesOutsideTheWordAreRefused) {
     const std::string lines[] = {"X,1,0,0,32,,rw,,y", "X,1,0,40,3,,rw,,y", "X,1,0,-1,3,,rw,,y",
                                  "X,20000,0,0,3,,rw,,y"};
-    const std::string reasons[] = {
-        "Register bit out of range 0 to 31: start bit 0, end bit 32",
-        "Register bit out of range 0 to 31: start bit 40, end bit 3",
-        "Register bit out of range 0 to 31: start bit -1, end bit 3",
-        "Register address out of range 0 to 1ffff: 20000"};
+    const std::string reasons[] = {"Register bit out of range 0 to 31: start bit 0, end bit 32",
+                                   "Register bit out of range 0 to 31: start bit 40, end bit 3",
+                                   "Register bit out of range 0 to 31: start bit -1, end bit 3",
+                                   "Register address out of range 0 to 1ffff: 20000"};
     for (size_t i = 0; i < 4; ++i) {
         EXPECT_EQ(initializeWith("h\nOK,1,0,0,31,,rw,,y\n" + lines[i] + "\n"), ORVNEBU_FAILED);
         auto m = messages();
@@ -173,7 +172,8 @@ TEST_F(RegisterCacheTest, OneHandlerPerFileSharedUntilTheLastSlaveGoes) {
     ASSERT_EQ(OrvNebu_DefaultRegisterHandler::getHandlerCount(), 0u);
     EXPECT_EQ(OrvNebu_DefaultRegisterHandler::findRegisterHandler(HANDLE, ""), nullptr);
     ASSERT_EQ(initialize(0), ORVNEBU_OK);
-    OrvNebu_RegisterHandler* shared = OrvNebu_DefaultRegisterHandler::findRegisterHandler(HANDLE, file);
+    OrvNebu_RegisterHandler* shared =
+        OrvNebu_DefaultRegisterHandler::findRegisterHandler(HANDLE, file);
     ASSERT_NE(shared, nullptr);
     ASSERT_EQ(initialize(1), ORVNEBU_OK);
     ASSERT_EQ(initialize(2), ORVNEBU_OK);  // another slave type naming the same file

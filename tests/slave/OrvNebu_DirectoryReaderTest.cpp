@@ -34,9 +34,10 @@ protected:
 
 TEST_F(DirectoryReaderTest, HeaderInAnyCaseOrderAndSpacing) {
     Orv_HashMapCStr entry;
-    ASSERT_TRUE(lookup(" Slave_Type ,ORV_DRV_VER_MIN,orv_drv_ver_max,Registers,parameters\n"
-                       "0x11,1,2,R.csv,P.csv\n",
-                       0x11, 1, entry));
+    ASSERT_TRUE(
+        lookup(" Slave_Type ,ORV_DRV_VER_MIN,orv_drv_ver_max,Registers,parameters\n"
+               "0x11,1,2,R.csv,P.csv\n",
+               0x11, 1, entry));
     EXPECT_EQ(entry, (Orv_HashMapCStr{{"slave_type", "0x11"},
                                       {"orv_drv_ver_min", "1"},
                                       {"orv_drv_ver_max", "2"},
@@ -49,9 +50,10 @@ TEST_F(DirectoryReaderTest, HeaderInAnyCaseOrderAndSpacing) {
               " R.csv ");
     // The same header column twice: the leftmost value stays.
     entry.clear();
-    ASSERT_TRUE(lookup("registers,slave_type,orv_drv_ver_min,orv_drv_ver_max,registers\n"
-                       "left.csv,1,1,1,right.csv\n",
-                       1, 1, entry));
+    ASSERT_TRUE(
+        lookup("registers,slave_type,orv_drv_ver_min,orv_drv_ver_max,registers\n"
+               "left.csv,1,1,1,right.csv\n",
+               1, 1, entry));
     EXPECT_EQ(entry["registers"], "left.csv");
 }
 
@@ -73,15 +75,16 @@ TEST_F(DirectoryReaderTest, KeyColumnsInEveryNumberBase) {
 
 TEST_F(DirectoryReaderTest, LinesFirstMatchWinsShortLinesSkippedLongLinesCut) {
     EXPECT_EQ(registersFor("a,b,slave_type,orv_drv_ver_min,orv_drv_ver_max,registers\n"
-                           "x,y,1,1\n"                  // too short for the key columns
+                           "x,y,1,1\n"                    // too short for the key columns
                            "x,y,1,1,1,first.csv,extra\n"  // extra fields ignored
                            "x,y,1,1,1,second.csv\n",
                            1, 1),
               "first.csv");
     Orv_HashMapCStr entry;
-    ASSERT_TRUE(lookup("slave_type,orv_drv_ver_min,orv_drv_ver_max,registers,parameters\n"
-                       "1,1,1\n",
-                       1, 1, entry));
+    ASSERT_TRUE(
+        lookup("slave_type,orv_drv_ver_min,orv_drv_ver_max,registers,parameters\n"
+               "1,1,1\n",
+               1, 1, entry));
     EXPECT_EQ(entry.size(), 3u);  // a line shorter than the header delivers what it has
     EXPECT_EQ(entry.count("registers"), 0u);
     // CR LF line ends read like LF.
@@ -141,11 +144,11 @@ TEST(SlaveFactoryRecords, FourteenRecordsSortedWithTheirVersionRanges) {
     size_t count = 0;
     const OrvNebu_SlaveFactory::CreationRecord* r = OrvNebu_SlaveFactory::records(count);
     ASSERT_EQ(count, 14u);
-    const int32_t expected[14][3] = {
-        {0x00, 0, 0xFFFF}, {0x01, 1, 1},      {0x11, 1, 0xFFFF}, {0x12, 1, 0xFFFF},
-        {0x13, 1, 0xFFFF}, {0x14, 1, 0xFFFF}, {0x15, 1, 0xFFFF}, {0x21, 1, 0xFFFF},
-        {0x31, 1, 0xFFFF}, {0x41, 1, 1},      {0x42, 1, 1},      {0x43, 1, 1},
-        {0x44, 1, 1},      {0x45, 1, 1}};
+    const int32_t expected[14][3] = {{0x00, 0, 0xFFFF}, {0x01, 1, 1},      {0x11, 1, 0xFFFF},
+                                     {0x12, 1, 0xFFFF}, {0x13, 1, 0xFFFF}, {0x14, 1, 0xFFFF},
+                                     {0x15, 1, 0xFFFF}, {0x21, 1, 0xFFFF}, {0x31, 1, 0xFFFF},
+                                     {0x41, 1, 1},      {0x42, 1, 1},      {0x43, 1, 1},
+                                     {0x44, 1, 1},      {0x45, 1, 1}};
     for (size_t i = 0; i < count; ++i) {
         EXPECT_EQ(r[i].slaveType, expected[i][0]) << i;
         EXPECT_EQ(r[i].minDriverVersion, expected[i][1]) << i;

@@ -13,9 +13,9 @@ struct BusTransfer {
     bool increment = false;
     uint32_t slave = 0;
     uint32_t address = 0;
-    uint32_t count = 0;      // the control word's count (0 for single transfers)
-    uint32_t dataBits = 0;   // bits of the data command
-    uint64_t data = 0;       // its bits as one number (a single word's value); 0 past 64 bits
+    uint32_t count = 0;     // the control word's count (0 for single transfers)
+    uint32_t dataBits = 0;  // bits of the data command
+    uint64_t data = 0;      // its bits as one number (a single word's value); 0 past 64 bits
 };
 
 struct TraceCommand {

@@ -9,7 +9,8 @@
 class TempDataDir {
 public:
     TempDataDir() {
-        std::string pattern = (std::filesystem::temp_directory_path() / "nebu-data-XXXXXX").string();
+        std::string pattern =
+            (std::filesystem::temp_directory_path() / "nebu-data-XXXXXX").string();
         if (mkdtemp(pattern.data()) == nullptr) throw std::runtime_error("mkdtemp failed");
         path_ = pattern;
     }
