@@ -1,8 +1,6 @@
 // The exported slave calls: identity words, initialize/terminate, the frame's checks, and raw
 // reads and writes as hexadecimal text.
 #include <cstring>
-#include <fstream>
-#include <sstream>
 
 #include "host/OrvCore.h"
 #include "registers/OrvNebu_DefaultRegisterHandler.h"
@@ -221,10 +219,7 @@ class DemoDataTest : public TestHost {};
 
 // The shipped directory and register files against the shipped board.
 TEST_F(DemoDataTest, DemoBoardSlavesShowTheirRegisters) {
-    std::ifstream in(std::string(NEBU_TEST_BOARDS_DIR) + "/demo.json");
-    std::stringstream json;
-    json << in.rdbuf();
-    loadBoard(json.str());
+    loadBoardFile(std::string(NEBU_TEST_BOARDS_DIR) + "/demo.json");
     for (uint32_t s = 0; s < 3; ++s) {
         ASSERT_EQ(OrvNebu_initialize(HANDLE, ORV_SLAVE_REF{0, 1, s}), ORVNEBU_OK) << s;
     }
