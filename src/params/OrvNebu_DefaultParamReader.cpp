@@ -6,6 +6,7 @@
 #include <cctype>
 #include <climits>
 #include <fstream>
+#include <mutex>
 #include <stdexcept>
 
 #include "base/Orv_AbortException.h"
@@ -50,11 +51,19 @@ OrvNebu_DefaultParamReader::ParamStorage& OrvNebu_DefaultParamReader::paramStora
     return storage;
 }
 
+// Sessions are serialised by their own target locks only, so two sessions may reach the
+// process-wide cache at once (one reading a file while another ends).
+static std::mutex& storageMutex() {
+    static std::mutex mutex;
+    return mutex;
+}
+
 void OrvNebu_DefaultParamReader::SessionEndListener::sessionNotice(uint32_t handle) {
     (void)handle;
 }
 
 void OrvNebu_DefaultParamReader::SessionEndListener::sessionEnded(uint32_t handle) {
+    std::lock_guard<std::mutex> guard(storageMutex());
     ParamStorage& storage = paramStorage();
     const std::string lowest;
     auto it = storage.lower_bound(ParamListLess::Key(handle, &lowest));
@@ -70,6 +79,7 @@ OrvNebu_DefaultParamReader::OrvNebu_DefaultParamReader(uint32_t handle, const st
 }
 
 size_t OrvNebu_DefaultParamReader::cachedFileCount(uint32_t handle) {
+    std::lock_guard<std::mutex> guard(storageMutex());
     size_t count = 0;
     for (const ParamList& entry : paramStorage()) count += entry.handle == handle ? 1 : 0;
     return count;
@@ -78,6 +88,7 @@ size_t OrvNebu_DefaultParamReader::cachedFileCount(uint32_t handle) {
 OrvNebu_DefaultParamReader::ChoiceActions* OrvNebu_DefaultParamReader::getFromStorage(
     uint32_t handle, const std::string& fileName) {
     if (fileName.empty()) return nullptr;
+    std::lock_guard<std::mutex> guard(storageMutex());
     ParamStorage& storage = paramStorage();
     auto it = storage.find(ParamListLess::Key(handle, &fileName));
     if (it == storage.end()) return nullptr;
@@ -88,6 +99,7 @@ OrvNebu_DefaultParamReader::ChoiceActions* OrvNebu_DefaultParamReader::getFromSt
 OrvNebu_DefaultParamReader::ChoiceActions* OrvNebu_DefaultParamReader::addToStorage(
     uint32_t handle, const std::string& fileName, std::unique_ptr<ChoiceActions> actions) {
     // An entry already there keeps its actions (slaves may refer to them).
+    std::lock_guard<std::mutex> guard(storageMutex());
     return paramStorage()
         .emplace(handle, fileName, std::move(actions), header_)
         .first->choiceActions.get();

@@ -1,12 +1,14 @@
 // Parameter definition files: the row format, every message, the per-session cache, printing.
 #include <gtest/gtest.h>
 
+#include <atomic>
 #include <cstring>
 #include <filesystem>
 #include <fstream>
 #include <sstream>
 #include <stdexcept>
 #include <string>
+#include <thread>
 #include <vector>
 
 #include "base/Orv_AbortException.h"
@@ -328,4 +330,25 @@ TEST_F(ParamReader, PrintsTheFileBackAndAgainFromTheCache) {
     EXPECT_THROW(OrvNebu_DefaultParamReader::readAndPrint(bad, none), Orv_AbortException);
     EXPECT_EQ((std::vector<Said>{{0, 512, "Unable to parse file: " + bad + " line:2: M,0,a"}}),
               said());
+}
+
+TEST_F(ParamReader, SessionsMayReadAndEndAtTheSameTime) {
+    // Each session is serialised by its own target lock only: one session may read a file
+    // into the cache while the host ends another.
+    const std::string path = write("p.csv", MODE_FILE);
+    constexpr uint32_t FIRST = 5000;
+    constexpr uint32_t COUNT = 400;
+    std::atomic<bool> done(false);
+    std::thread ender([&] {
+        for (uint32_t k = 0; !done; ++k) OrvSim::endSession(FIRST + k % COUNT);
+    });
+    size_t loaded = 0;
+    for (uint32_t i = 0; i < COUNT; ++i) loaded += load(path, FIRST + i).size();
+    done = true;
+    ender.join();
+    EXPECT_EQ(2u * COUNT, loaded);
+    for (uint32_t i = 0; i < COUNT; ++i) OrvSim::endSession(FIRST + i);
+    for (uint32_t i = 0; i < COUNT; ++i) {
+        ASSERT_EQ(0u, OrvNebu_DefaultParamReader::cachedFileCount(FIRST + i));
+    }
 }
