@@ -338,12 +338,20 @@ TEST_F(ParamReader, SessionsMayReadAndEndAtTheSameTime) {
     const std::string path = write("p.csv", MODE_FILE);
     constexpr uint32_t FIRST = 5000;
     constexpr uint32_t COUNT = 400;
+    // The host ends only sessions whose calls have returned.
+    std::atomic<uint32_t> finished(0);
     std::atomic<bool> done(false);
     std::thread ender([&] {
-        for (uint32_t k = 0; !done; ++k) OrvSim::endSession(FIRST + k % COUNT);
+        for (uint32_t k = 0; !done; ++k) {
+            const uint32_t n = finished;
+            if (n != 0) OrvSim::endSession(FIRST + k % n);
+        }
     });
     size_t loaded = 0;
-    for (uint32_t i = 0; i < COUNT; ++i) loaded += load(path, FIRST + i).size();
+    for (uint32_t i = 0; i < COUNT; ++i) {
+        loaded += load(path, FIRST + i).size();
+        finished = i + 1;
+    }
     done = true;
     ender.join();
     EXPECT_EQ(2u * COUNT, loaded);
