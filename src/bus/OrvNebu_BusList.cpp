@@ -39,6 +39,7 @@ void OrvNebu_BusList::sessionNotice(uint32_t) {}
 
 void OrvNebu_BusList::sessionEnded(uint32_t handle) {
     constexpr uint32_t LAST = std::numeric_limits<uint32_t>::max();
+    std::lock_guard<std::mutex> guard(mutex_);
     auto it = buses_.lower_bound(Key(handle, 0, 0));
     const auto end = buses_.upper_bound(Key(handle, LAST, LAST));
     while (it != end) {
@@ -49,6 +50,7 @@ void OrvNebu_BusList::sessionEnded(uint32_t handle) {
 
 OrvNebu_Transaction* OrvNebu_BusList::findBus(uint32_t handle, uint32_t device,
                                               uint32_t userChain) {
+    std::lock_guard<std::mutex> guard(mutex_);
     auto it = buses_.find(Key(handle, device, userChain));
     return it == buses_.end() ? nullptr : it->second;
 }
@@ -57,13 +59,17 @@ void OrvNebu_BusList::addBus(uint32_t handle, uint32_t device, uint32_t userChai
                              OrvNebu_Transaction* bus) {
     // The host may have forgotten the list with the last session; register again each time
     // the list starts afresh.
+    std::lock_guard<std::mutex> guard(mutex_);
     if (buses_.empty()) addSessionMessageListener(this);
     buses_[Key(handle, device, userChain)] = bus;
 }
 
 void OrvNebu_BusList::removeBus(uint32_t handle, uint32_t device, uint32_t userChain,
                                 OrvNebu_Transaction*& bus) {
-    buses_.erase(Key(handle, device, userChain));
+    {
+        std::lock_guard<std::mutex> guard(mutex_);
+        buses_.erase(Key(handle, device, userChain));
+    }
     delete bus;
     bus = nullptr;
 }

@@ -3,6 +3,7 @@
 
 #include <cstdint>
 #include <map>
+#include <mutex>
 #include <tuple>
 
 #include "bus/OrvNebu_Transaction.h"
@@ -34,6 +35,9 @@ private:
     OrvNebu_BusList() = default;
     ~OrvNebu_BusList() = default;
     using Key = std::tuple<uint32_t, uint32_t, uint32_t>;
+    // Sessions are serialised only by their own target locks, and the host may end a session
+    // from another thread: the map itself needs a guard.
+    std::mutex mutex_;
     std::map<Key, OrvNebu_Transaction*> buses_;
 };
 

@@ -198,14 +198,16 @@ void OrvNebu_RegisterHandler::toDigits(const std::string& value, const Register&
     }
 }
 
-OrvNebu_RegisterHandler* OrvNebu_RegisterHandler::findInCache(const Cache& cache,
+OrvNebu_RegisterHandler* OrvNebu_RegisterHandler::findInCache(Cache& cache,
                                                               const std::string& regFilename) {
     if (regFilename.empty()) return nullptr;
+    std::lock_guard<std::mutex> guard(cache.mutex);
     auto it = cache.storage.find(regFilename);
     return it == cache.storage.end() ? nullptr : it->second;
 }
 
 void OrvNebu_RegisterHandler::releaseToCache(Cache& cache) {
+    std::lock_guard<std::mutex> guard(cache.mutex);
     if (cache.handlerCount != 0) {
         uint32_t before = cache.handlerCount--;
         if (before != 1) return;

@@ -6,6 +6,7 @@
 #include <cstdint>
 #include <deque>
 #include <memory>
+#include <mutex>
 #include <ostream>
 #include <string>
 #include <unordered_map>
@@ -81,7 +82,9 @@ public:
 
 protected:
     // One handler class's cache: file name to handler (owned), and the references handed out.
+    // The caches are process-wide and sessions run on their own threads, hence the guard.
     struct Cache {
+        std::mutex mutex;
         std::unordered_map<std::string, OrvNebu_RegisterHandler*> storage;
         uint32_t handlerCount = 0;
     };
@@ -108,6 +111,7 @@ protected:
     template <class Handler>
     static OrvNebu_RegisterHandler* getFromCache(Cache& cache, uint32_t handle,
                                                  const std::string& regFilename) {
+        std::lock_guard<std::mutex> guard(cache.mutex);
         ++cache.handlerCount;
         if (!regFilename.empty()) {
             auto it = cache.storage.find(regFilename);
@@ -118,7 +122,7 @@ protected:
         slot = fresh.release();
         return slot;
     }
-    static OrvNebu_RegisterHandler* findInCache(const Cache& cache, const std::string& regFilename);
+    static OrvNebu_RegisterHandler* findInCache(Cache& cache, const std::string& regFilename);
     // One reference fewer; the last one (or a release at 0) destroys every cached handler.
     static void releaseToCache(Cache& cache);
 
