@@ -16,13 +16,23 @@ namespace {
 
 class ConcurrentSessions : public TestHost {};
 
-// One session's work, repeated: everything that creates or drops shared state.
-uint32_t sessionWork(uint32_t handle, uint32_t rounds) {
+// Each session drives a device of its own (one JTAG target each), as a host would.
+const char* const BOARD = R"({ "devices": [
+    { "chains": { "1": { "cores": [ { "type": 14, "master": { "slaveCount": 8, "slaves": {
+        "0": { "slaveType": "0x11", "driverVersion": 1 } } } } ] } } },
+    { "chains": { "1": { "cores": [ { "type": 14, "master": { "slaveCount": 8, "slaves": {
+        "0": { "slaveType": "0x11", "driverVersion": 1 } } } } ] } } },
+    { "chains": { "1": { "cores": [ { "type": 14, "master": { "slaveCount": 8, "slaves": {
+        "0": { "slaveType": "0x11", "driverVersion": 1 } } } } ] } } } ] })";
+
+// One session's work, repeated: everything that creates or drops shared state (the bus
+// list, the register handler cache, the parameter file cache).
+uint32_t sessionWork(uint32_t handle, uint32_t device, uint32_t rounds) {
     uint32_t failures = 0;
-    const ORV_SLAVE_REF slave{0, 1, 0};
+    const ORV_SLAVE_REF slave{device, 1, 0};
     for (uint32_t i = 0; i < rounds; ++i) {
         uint32_t count = 0;
-        failures += OrvNebu_getSlaveCount(handle, 0, 1, &count) != 0 || count != 8;
+        failures += OrvNebu_getSlaveCount(handle, device, 1, &count) != 0 || count != 8;
         failures += OrvNebu_initialize(handle, slave) != 0;
         ORV_HASHMAP_HANDLE regs = OrvContainer_hashmapCStr_new();
         ORV_HASHMAP_HANDLE params = OrvContainer_hashmapCStr_new();
@@ -37,13 +47,15 @@ uint32_t sessionWork(uint32_t handle, uint32_t rounds) {
     return failures;
 }
 
-TEST_F(ConcurrentSessions, TwoSessionsDiscoverInitializeReadAndEndAtOnce) {
-    loadBoardFile(std::string(NEBU_TEST_BOARDS_DIR) + "/demo.json");
+TEST_F(ConcurrentSessions, ThreeSessionsDiscoverInitializeReadAndEndAtOnce) {
+    loadBoard(BOARD);
     constexpr uint32_t ROUNDS = 120;
     std::atomic<uint32_t> failures(0);
     std::vector<std::thread> threads;
-    for (uint32_t handle : {7001u, 7002u, 7003u}) {
-        threads.emplace_back([handle, &failures] { failures += sessionWork(handle, ROUNDS); });
+    for (uint32_t device = 0; device < 3; ++device) {
+        threads.emplace_back([device, &failures] {
+            failures += sessionWork(7001 + device, device, ROUNDS);
+        });
     }
     for (std::thread& t : threads) t.join();
     EXPECT_EQ(0u, failures.load());
