@@ -53,6 +53,26 @@ public:
     uint16_t peek(uint32_t device, uint32_t chain, uint32_t slave, uint32_t address) const;
     void poke(uint32_t device, uint32_t chain, uint32_t slave, uint32_t address, uint16_t value);
 
+    // Inspection and fault settings of the chain's first bus master, for tests; throw
+    // std::out_of_range like peek.
+    // Error bits 0 and 1 of command 3.
+    uint32_t busErrorBits(uint32_t device, uint32_t chain) const;
+    // Error bit of a slave position (also an empty one below slaveCount).
+    bool slaveErrorBit(uint32_t device, uint32_t chain, uint32_t slave) const;
+    // The last reset control word written (slaveCount + 2 bits, bit k = bit k%8 of byte k/8);
+    // empty before the first one.
+    std::vector<uint8_t> lastResetControl(uint32_t device, uint32_t chain) const;
+    // The last transfer control word (29 bits) and address word (19 bits) written; 0 before.
+    uint32_t lastTransferControl(uint32_t device, uint32_t chain) const;
+    uint32_t lastAddressWord(uint32_t device, uint32_t chain) const;
+    // Bits 0 and 1 of value become the bus error bits.
+    void setBusErrorBits(uint32_t device, uint32_t chain, uint32_t bits);
+    void setSlaveFaulty(uint32_t device, uint32_t chain, uint32_t slave, bool faulty);
+    // As resetPolls / clockPolls / clockRunning of the board file, from the next handshake on.
+    void setResetPolls(uint32_t device, uint32_t chain, int32_t polls);
+    void setClockPolls(uint32_t device, uint32_t chain, int32_t polls);
+    void setClockRunning(uint32_t device, uint32_t chain, bool running);
+
     struct Impl;
 
 private:

@@ -1,0 +1,197 @@
+// The board file reader: number forms, defaults, and one clear error per malformed file.
+#include <gtest/gtest.h>
+#include <unistd.h>
+
+#include <cstdio>
+#include <fstream>
+
+#include "board/BoardBus.h"
+
+using boardtest::BoardBus;
+using OrvSim::Board;
+using OrvSim::BoardError;
+
+namespace {
+
+std::string errorOf(const std::string& json, const std::string& name = "boards/x.json") {
+    try {
+        Board::loadText(json, name);
+    } catch (const BoardError& e) {
+        return e.what();
+    }
+    return "(no error)";
+}
+
+// A board whose device 0, chain 1, core 1 has the given master body.
+std::string withMaster(const std::string& master) {
+    return R"({"devices":[{"chains":{"1":{"cores":[{"type":3},{"type":14,"master":{)" + master +
+           "}}]}}}]}";
+}
+
+class BoardReaderTest : public BoardBus {};
+
+TEST_F(BoardReaderTest, NumbersAsJsonNumbersOrDecimalOrHexText) {
+    loadMaster(R"("slaveCount": "0x3", "periodInt": "1000", "periodFrc": 0, "resetPolls": "-1",
+                  "clockPolls": "0X2", "busErrors": "2",
+                  "slaves": {"0x2": {"slaveType": "0xabCD", "driverVersion": "65535",
+                                     "memory": {"16": [7, "0x8", "9"], "0x1FFFF": "0xffff"}}})");
+    EXPECT_EQ(slaveCount, 3u);
+    EXPECT_EQ(board->peek(DEV, CHAIN, 2, 0x1FFF0), 0xABCD);
+    EXPECT_EQ(board->peek(DEV, CHAIN, 2, 0x1FFF1), 0xFFFF);
+    EXPECT_EQ(board->peek(DEV, CHAIN, 2, 16), 7);
+    EXPECT_EQ(board->peek(DEV, CHAIN, 2, 17), 8);
+    EXPECT_EQ(board->peek(DEV, CHAIN, 2, 18), 9);
+    EXPECT_EQ(board->peek(DEV, CHAIN, 2, 0x1FFFF), 0xFFFF);
+    EXPECT_EQ(busErrors(), 2u);
+    busReset();
+    for (int i = 0; i < 20; ++i)
+        ASSERT_EQ(masterStatus(), 0u) << "resetPolls \"-1\" never completes";
+
+    std::vector<uint8_t> bits(20);
+    uint32_t info[5];
+    ASSERT_TRUE(board->coreStatus(DEV, CHAIN, 1, info, bits.data(), 160));
+    EXPECT_EQ(
+        (boardtest::valueOf(std::vector<uint8_t>(bits.begin() + 8, bits.end()), 32) >> 4) & 0x3FF,
+        1000u);
+}
+
+TEST_F(BoardReaderTest, DefaultsOfAnEmptyMaster) {
+    loadMaster("");
+    EXPECT_EQ(slaveCount, 0u);
+    EXPECT_EQ(busErrors(), 0u);
+    // resetPolls and clockPolls 1, clock running, no clock reset in the status.
+    write(1, 0x1, 2);
+    write(1, 0x0, 2);
+    EXPECT_EQ(masterStatus(), 2u);
+    write(7, 1, 4);
+    write(7, 0, 4);
+    EXPECT_EQ(read(7, 3), 2u);
+    std::vector<uint8_t> bits(20, 0xFF);
+    uint32_t info[5];
+    ASSERT_TRUE(board->coreStatus(DEV, CHAIN, 1, info, bits.data(), 160));
+    for (uint8_t b : bits) EXPECT_EQ(b, 0u);
+}
+
+TEST(BoardReaderErrors, MessagesNameTheFileThePlaceAndTheProblem) {
+    struct Case {
+        std::string json;
+        std::string message;
+    };
+    const std::string M = "boards/x.json: devices[0].chains.1.cores[1].master.";
+    const std::vector<Case> cases = {
+        {"[]", "boards/x.json: expected a JSON object, got []"},
+        {"{}", "boards/x.json: \"devices\" is missing"},
+        {R"({"devices": {}})", "boards/x.json: devices: expected an array, got {}"},
+        {R"({"devices": [], "boards": 1})",
+         "boards/x.json: boards: unknown key (known keys: devices)"},
+        {R"({"devices": [7]})", "boards/x.json: devices[0]: expected an object, got 7"},
+        {R"({"devices": [{"trellom": "yes"}]})",
+         "boards/x.json: devices[0].trellom: expected true or false, got \"yes\""},
+        {R"({"devices": [{}, {"colour": 1}]})",
+         "boards/x.json: devices[1].colour: unknown key (known keys: trellom, chains)"},
+        {R"({"devices": [{"chains": {"one": {}}}]})",
+         "boards/x.json: devices[0].chains.one: chain \"one\" is not a decimal or 0x hexadecimal "
+         "number"},
+        {R"({"devices": [{"chains": {"1": {}, "0x1": {}}}]})",
+         "boards/x.json: devices[0].chains.1: chain 1 is given twice"},
+        {R"({"devices": [{"chains": {"4294967296": {}}}]})",
+         "boards/x.json: devices[0].chains.4294967296: chain 4294967296 is out of range "
+         "0..4294967295"},
+        {R"({"devices": [{"chains": {"1": {"cores": {}}}}]})",
+         "boards/x.json: devices[0].chains.1.cores: expected an array, got {}"},
+        {R"({"devices": [{"chains": {"1": {"cores": [{"master": {}}]}}}]})",
+         "boards/x.json: devices[0].chains.1.cores[0]: \"type\" is missing"},
+        {R"({"devices": [{"chains": {"1": {"cores": [{"type": 1.5}]}}}]})",
+         "boards/x.json: devices[0].chains.1.cores[0].type: expected a whole number, got 1.5"},
+        {R"({"devices": [{"chains": {"1": {"cores": [{"type": -3}]}}}]})",
+         "boards/x.json: devices[0].chains.1.cores[0].type: -3 is out of range 0..4294967295"},
+        {R"({"devices": [{"chains": {"1": {"cores": [{"type": "14 "}]}}}]})",
+         "boards/x.json: devices[0].chains.1.cores[0].type: \"14 \" is not a decimal or 0x "
+         "hexadecimal number"},
+        {R"({"devices": [{"chains": {"1": {"cores": [{"type": 3, "status": "0xG1"}]}}}]})",
+         "boards/x.json: devices[0].chains.1.cores[0].status: \"0xG1\" is not a hexadecimal "
+         "number"},
+        {R"({"devices": [{"chains": {"1": {"cores": [{"type": 3, "status": true}]}}}]})",
+         "boards/x.json: devices[0].chains.1.cores[0].status: expected a hexadecimal text, got "
+         "true"},
+        {withMaster(R"("slaveCount": 300)"), M + "slaveCount: 300 is out of range 0..255"},
+        {withMaster(R"("slaveCount": "0x100")"), M + "slaveCount: 0x100 is out of range 0..255"},
+        {withMaster(R"("slaveCount": "99999999999999999999999")"),
+         M + "slaveCount: 99999999999999999999999 is out of range 0..255"},
+        {withMaster(R"("periodInt": 1024)"), M + "periodInt: 1024 is out of range 0..1023"},
+        {withMaster(R"("resetPolls": -2)"), M + "resetPolls: -2 is out of range -1..2147483647"},
+        {withMaster(R"("clockPolls": "-5")"), M + "clockPolls: -5 is out of range -1..2147483647"},
+        {withMaster(R"("busErrors": 4)"), M + "busErrors: 4 is out of range 0..3"},
+        {withMaster(R"("dclkHasReset": 1)"), M + "dclkHasReset: expected true or false, got 1"},
+        {withMaster(R"("slaves": [])"), M + "slaves: expected an object, got []"},
+        {withMaster(R"("slaveCount": 2, "slaves": {"2": {}})"),
+         M + "slaves.2: slave index 2 is not below slaveCount 2"},
+        {withMaster(R"("slaves": {"0": {}})"),
+         M + "slaves.0: slave index 0 is not below slaveCount 0"},
+        {withMaster(R"("slaveCount": 2, "slaves": {"1": {}, "0x1": {}})"),
+         M + "slaves.1: slave 1 is given twice"},
+        {withMaster(R"("slaveCount": 1, "slaves": {"0": {"slaveType": 65536}})"),
+         M + "slaves.0.slaveType: 65536 is out of range 0..0xFFFF"},
+        {withMaster(R"("slaveCount": 1, "slaves": {"0": {"faulty": "no"}})"),
+         M + "slaves.0.faulty: expected true or false, got \"no\""},
+        {withMaster(R"("slaveCount": 1, "slaves": {"0": {"speed": 1}})"),
+         M + "slaves.0.speed: unknown key (known keys: slaveType, driverVersion, coreType, "
+             "cgVersion, cgAlphaVersion, edaVersion, word6, nextSlave, faulty, memory)"},
+        {withMaster(R"("slaveCount": 1, "slaves": {"0": {"memory": {"0x20000": 1}}})"),
+         M + "slaves.0.memory.0x20000: address 0x20000 is out of range 0..0x1FFFF"},
+        {withMaster(R"("slaveCount": 1, "slaves": {"0": {"memory": {"0x10": "0x10000"}}})"),
+         M + "slaves.0.memory.0x10: 0x10000 is out of range 0..0xFFFF"},
+        {withMaster(R"("slaveCount": 1, "slaves": {"0": {"memory": {"0x10": [1, {}]}}})"),
+         M + "slaves.0.memory.0x10[1]: expected a number, got {}"},
+        {withMaster(R"("slaveCount": 1, "slaves": {"0": {"memory": {"0x1FFFE": [1, 2, 3]}}})"),
+         M + "slaves.0.memory.0x1FFFE: 3 words from 0x1FFFE run past 0x1FFFF"},
+        {withMaster(R"("slaveCount": 1, "slaves": {"0": {"memory": {"0x1FFE0": [0,0,0,0,0,0,0,0,
+                       0,0,0,0,0,0,0,0,0]}}})"),
+         M + "slaves.0.memory.0x1FFE0: address 0x1FFF0 holds an identification word "
+             "(slaveType ... nextSlave)"},
+        {withMaster(R"("slaveCount": 1, "slaves": {"0": {"memory": {"0x10": [1, 2], "17": 3}}})"),
+         M + "slaves.0.memory.17: address 0x11 is given twice"},
+    };
+    for (const Case& c : cases) EXPECT_EQ(errorOf(c.json), c.message) << c.json;
+
+    const std::string bad = errorOf("{\"devices\": [\n{,}]}", "broken.json");
+    EXPECT_EQ(bad.rfind("broken.json: not valid JSON: parse error at line 2, column 2", 0), 0u)
+        << bad;
+    EXPECT_EQ(errorOf("", "empty.json").rfind("empty.json: not valid JSON: ", 0), 0u);
+}
+
+TEST(BoardReaderErrors, UnreadableFiles) {
+    const std::string missing = "/nonexistent/dir/board.json";
+    try {
+        Board::loadFile(missing);
+        ADD_FAILURE() << "loaded a missing file";
+    } catch (const BoardError& e) {
+        EXPECT_EQ(std::string(e.what()), missing + ": cannot be read: No such file or directory");
+    }
+    try {
+        Board::loadFile("/");
+        ADD_FAILURE() << "loaded a directory";
+    } catch (const BoardError& e) {
+        EXPECT_EQ(std::string(e.what()), "/: cannot be read: Is a directory");
+    }
+
+    // A file's own name is the name in its errors.
+    char name[] = "/tmp/nebu_board_XXXXXX";
+    const int fd = mkstemp(name);
+    ASSERT_GE(fd, 0);
+    close(fd);
+    {
+        std::ofstream out(name);
+        out << R"({"devices": [{"trellom": 0}]})";
+    }
+    try {
+        Board::loadFile(name);
+        ADD_FAILURE() << "loaded a malformed file";
+    } catch (const BoardError& e) {
+        EXPECT_EQ(std::string(e.what()),
+                  std::string(name) + ": devices[0].trellom: expected true or false, got 0");
+    }
+    std::remove(name);
+}
+
+}  // namespace
