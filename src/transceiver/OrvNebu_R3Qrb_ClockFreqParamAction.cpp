@@ -16,10 +16,9 @@ OrvNebu_R3Qrb_ClockFreqParamAction::OrvNebu_R3Qrb_ClockFreqParamAction(OrvNebu_D
                                                                        uint32_t priority)
     : OrvNebu_CounterFreqParamAction(slave, priority, OUT_PARAM_2_REG, OUT_PARAM_COUNT, false) {}
 
-std::string OrvNebu_R3Qrb_ClockFreqParamAction::frequencyText(const Param2Reg& row,
+std::string OrvNebu_R3Qrb_ClockFreqParamAction::frequencyText(const Param2Reg&,
                                                               const std::string& sysclkText,
                                                               uint64_t count, uint64_t tune) {
-    (void)row;
     return floatFrequencyText(sysclkText, count, tune);
 }
 

@@ -148,45 +148,6 @@ protected:
 
 }  // namespace
 
-TEST_F(RefClockChain, OwnInputGlobalClockAndChainEnds) {
-    MemorySlave& first = dual(1, "1", "1");
-    MemorySlave& last = dual(2, "0", "2");
-    last.memory["REFCLKSEL"] = "3";
-    EXPECT_EQ("dual_2:0", ask(last));
-    for (const char* select : {"0", "2", "4", "6", "8", "-1", ""}) {
-        last.memory["REFCLKSEL"] = select;
-        EXPECT_EQ("GREFCLK", ask(last)) << select;
-    }
-    last.memory["REFCLKSEL"] = "5";
-    EXPECT_EQ("Unknown ref clock source", ask(last)) << "no next slave";
-    first.memory["REFCLKSEL"] = "1";
-    EXPECT_EQ("Unknown ref clock source", ask(first)) << "no previous slave";
-
-    // A driver question on its own answers with the dual's name only when it drives that way.
-    EXPECT_EQ("Unknown ref clock source", ask(last, "internal_param_SOUTH_DRIVER"));
-    last.memory["CLKSOUTH_SEL"] = "1";
-    EXPECT_EQ("dual_2:0", ask(last, "internal_param_SOUTH_DRIVER"));
-    first.memory["REFCLKSEL"] = "7";
-    EXPECT_EQ("dual_2:0", ask(first));
-    EXPECT_NO_MESSAGES();
-}
-
-TEST_F(RefClockChain, ThreeDualsNameTheNearestDriverInEachDirection) {
-    MemorySlave& a = dual(0, "1", "A");
-    MemorySlave& b = dual(1, "1", "B");
-    MemorySlave& c = dual(2, "0", "C");
-    a.memory["CLKNORTH_SEL"] = "1";
-    c.memory["REFCLKSEL"] = "1";
-    EXPECT_EQ("dual_A:0", ask(c));
-    b.memory["CLKNORTH_SEL"] = "1";
-    EXPECT_EQ("dual_B:0", ask(c)) << "the nearest driver wins";
-
-    a.memory["REFCLKSEL"] = "5";
-    c.memory["CLKSOUTH_SEL"] = "1";
-    EXPECT_EQ("dual_C:0", ask(a));
-    EXPECT_EQ("dual_C:0", ask(b, "internal_param_SOUTH_DRIVER"));
-}
-
 TEST_F(RefClockChain, LoopingNextSlaveLinksEndWithTheUnknownSource) {
     // 4 -> 5 -> 6 -> 4: no dual drives, so every question would go round for ever.
     MemorySlave& a = dual(4, "1", "4");
