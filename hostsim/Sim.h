@@ -19,6 +19,7 @@ ORV_CORE_API void setBoard(std::shared_ptr<Board> board);
 ORV_CORE_API std::shared_ptr<Board> getBoard();
 
 // What Orv_Util::getVanduDataDirPath returns; a trailing separator is added when missing.
+// Empty text forgets it ("./" again).
 ORV_UTIL_API void setDataDir(const std::string& dir);
 
 // Receives every OrvJtag_session_sendMessage. Default: none (messages are dropped).
@@ -42,10 +43,12 @@ struct JtagStats {
 ORV_JTAG_API JtagStats takeStats(uint32_t handle);
 
 // The host's end of a session: every registered SessionMessageListener gets sessionEnded,
-// then the session's core list (and the cores in it) and queue are dropped.
+// then the session's core list (and the cores in it) is dropped and its queued writes are
+// sent before the queue is dropped. Counters stay.
 ORV_CORE_API void endSession(uint32_t handle);
 
-// Forgets every session, core list, listener and sink: a fresh host, for tests.
+// Ends every session used so far, then forgets sinks, board, data directory and counters: a
+// fresh host, for tests. Listeners stay registered (they are process-wide plug-in objects).
 ORV_CORE_API void resetHost();
 
 }  // namespace OrvSim

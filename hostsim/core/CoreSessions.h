@@ -1,0 +1,14 @@
+// The stand-in host's per-session core lists, as the rest of the core library reaches them.
+#pragma once
+
+#include <cstdint>
+#include <vector>
+
+#include "host/OrvCore.h"
+
+namespace OrvSim {
+
+// The cores registered in a session, taken out of its list; the caller deletes them.
+std::vector<OrvRT::Orv_Core*> takeSessionCores(uint32_t handle);
+
+}  // namespace OrvSim
