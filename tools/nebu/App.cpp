@@ -1,0 +1,93 @@
+// Start-up and shut-down of the console, in the order a real host keeps: the target and the
+// data directory first, the plug-in loaded before the first command and unloaded after the
+// sessions have ended.
+#include "App.h"
+
+#include <fstream>
+#include <istream>
+#include <memory>
+#include <ostream>
+#include <string>
+#include <vector>
+
+#include "Console.h"
+#include "Options.h"
+#include "PluginApi.h"
+#include "SharedLibrary.h"
+#include "UsageError.h"
+#include "hostsim/Sim.h"
+#include "hostsim/board/Board.h"
+
+namespace nebu {
+
+namespace {
+std::shared_ptr<OrvSim::Board> loadBoard(const std::string& path) {
+    try {
+        return OrvSim::Board::loadFile(path);
+    } catch (const std::exception& e) {
+        std::string text = e.what();
+        // The user must learn which file was refused, whatever the loader says.
+        if (text.find(path) == std::string::npos) text = path + ": " + text;
+        throw UsageError(text);
+    }
+}
+
+// Runs after the plug-in is gone, so nothing of it can be called any more.
+struct HostReset {
+    ~HostReset() {
+        OrvSim::setMessageSink(nullptr);
+        OrvSim::setTraceSink(nullptr);
+        OrvSim::setBoard(nullptr);
+    }
+};
+}  // namespace
+
+int runNebu(int argc, char** argv, std::istream& in, std::ostream& out, std::ostream& err,
+            bool inIsTerminal) {
+    std::vector<std::string> args;
+    for (int i = 1; i < argc; ++i) args.emplace_back(argv[i]);
+    try {
+        const Options options = parseOptions(args);
+        if (options.help) {
+            out << usageText() << "Type 'help' at the prompt (or -e help) for the commands.\n";
+            return 0;
+        }
+        const std::string exeDir = executableDirectory(argc > 0 ? argv[0] : nullptr);
+        const std::string share = exeDir + "/../share/orvnebu/";
+
+        std::ifstream scriptFile;
+        const bool scriptFromStdin = options.script == "-";
+        if (!options.script.empty() && !scriptFromStdin) {
+            scriptFile.open(options.script);
+            if (!scriptFile) throw UsageError("cannot open script " + options.script);
+        }
+        auto board =
+            loadBoard(options.boardFile.empty() ? share + "boards/demo.json" : options.boardFile);
+
+        HostReset hostReset;
+        SharedLibrary plugin(options.pluginPath.empty() ? defaultPluginPath(exeDir)
+                                                        : options.pluginPath);
+        OrvSim::setBoard(board);
+        OrvSim::setDataDir(options.dataDir.empty() ? share + "data/" : options.dataDir);
+
+        Console console(PluginApi::resolve(plugin), out, err, options.session);
+        console.installSinks(options.trace);
+        if (scriptFile.is_open()) console.runStream(scriptFile, false);
+        if (scriptFromStdin) console.runStream(in, false);
+        for (const auto& command : options.commands) {
+            if (console.quitRequested()) break;
+            console.runLine(command);
+        }
+        if (options.script.empty() && options.commands.empty()) {
+            console.runStream(in, inIsTerminal);
+        }
+        console.finish();
+        return console.exitStatus();
+    } catch (const UsageError& e) {
+        out.flush();
+        err << "nebu: " << oneLine(e.what()) << std::endl;
+        return 2;
+    }
+}
+
+}  // namespace nebu

@@ -1,0 +1,84 @@
+// Command-line option parsing of the console.
+#include "Options.h"
+
+#include "CommandLine.h"
+#include "UsageError.h"
+
+namespace nebu {
+
+std::string usageText() {
+    return "usage: nebu [--board FILE] [--data-dir DIR] [--session N] [--trace] [--plugin PATH]"
+           " [-e COMMAND]... [SCRIPT]\n"
+           "  --board FILE     virtual board (JSON); default: the demo board\n"
+           "  --data-dir DIR   host data directory; default: the demo data directory\n"
+           "  --session N      session handle of the first command (default 1)\n"
+           "  --trace          print every JTAG operation\n"
+           "  --plugin PATH    plug-in library to load; default: the one built beside nebu\n"
+           "  -e COMMAND       run one command (repeatable); SCRIPT runs first when given\n"
+           "  SCRIPT           file of commands; without -e and SCRIPT, standard input\n";
+}
+
+Options parseOptions(const std::vector<std::string>& args) {
+    Options options;
+    bool scriptSeen = false;
+    auto setScript = [&](const std::string& path) {
+        if (scriptSeen)
+            throw UsageError("more than one script: '" + options.script + "', '" + path + "'");
+        options.script = path;
+        scriptSeen = true;
+    };
+    for (size_t i = 0; i < args.size(); ++i) {
+        std::string arg = args[i];
+        if (arg == "--") {
+            for (++i; i < args.size(); ++i) setScript(args[i]);
+            break;
+        }
+        if (arg.size() < 2 || arg[0] != '-') {
+            setScript(arg);
+            continue;
+        }
+        std::string inlineValue;
+        bool hasInlineValue = false;
+        if (arg.compare(0, 2, "--") == 0) {
+            const size_t eq = arg.find('=');
+            if (eq != std::string::npos) {
+                inlineValue = arg.substr(eq + 1);
+                hasInlineValue = true;
+                arg.resize(eq);
+            }
+        }
+        auto value = [&]() -> std::string {
+            if (hasInlineValue) return inlineValue;
+            if (i + 1 >= args.size()) throw UsageError("option " + arg + " needs an argument");
+            return args[++i];
+        };
+        auto noValue = [&]() {
+            if (hasInlineValue) throw UsageError("option " + arg + " takes no argument");
+        };
+        if (arg == "--board") {
+            options.boardFile = value();
+            if (options.boardFile.empty()) throw UsageError("option --board needs a file name");
+        } else if (arg == "--data-dir") {
+            options.dataDir = value();
+            if (options.dataDir.empty()) throw UsageError("option --data-dir needs a directory");
+        } else if (arg == "--plugin") {
+            options.pluginPath = value();
+            if (options.pluginPath.empty()) throw UsageError("option --plugin needs a path");
+        } else if (arg == "--session") {
+            options.session = parseNumber(value(), "--session");
+        } else if (arg == "--trace") {
+            noValue();
+            options.trace = true;
+        } else if (arg == "-e") {
+            options.commands.push_back(value());
+        } else if (arg == "--help" || arg == "-h") {
+            noValue();
+            options.help = true;
+        } else {
+            throw UsageError("unknown option '" + arg + "'");
+        }
+    }
+    return options;
+}
+
+}  // namespace nebu
