@@ -51,6 +51,9 @@ protected:
     OrvNebu_RegisterHandler* registerHandler_ = nullptr;
     // Whether registerHandler_ came from the single-register handler's cache.
     bool singleRegisterHandler_ = false;
+    // A handler cache counted a reference for this slave (also when reading the file failed);
+    // the destructor gives it back.
+    bool handlerCounted_ = false;
     OrvNebu_ActionsMap actions_;
     // Computed actions added by subclasses; owned by this slave (each once).
     std::vector<OrvNebu_ParamAction*> ownedActions_;

@@ -1,0 +1,25 @@
+// Plain text helpers of the definition-file readers: the comma split and the C-style number
+// readings the files rely on, without the undefined behaviour of atoi/strtol on overflow.
+#pragma once
+
+#include <cstdint>
+#include <string>
+#include <vector>
+
+namespace OrvRT {
+
+class OrvNebu_CsvText {
+public:
+    // Splits at every comma; adjacent commas give empty fields. Reuses fields' storage.
+    static void splitCommas(const std::string& line, std::vector<std::string>& fields);
+
+    // Leading blanks, optional sign, decimal digits; 0 without digits. Values beyond the
+    // 32-bit range saturate at INT32_MIN/INT32_MAX.
+    static int32_t decimalToInt32(const std::string& text);
+
+    // As decimalToInt32, but the base follows the text: 0x/0X hexadecimal, a leading 0 octal,
+    // decimal otherwise. Reading stops at the first character that does not fit the base.
+    static int32_t autoBaseToInt32(const std::string& text);
+};
+
+}  // namespace OrvRT

@@ -1,0 +1,227 @@
+// The bus list: discovery of the master, one bus per (session, device, chain), rediscovery,
+// the end of a session and the listener registration.
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <string>
+#include <vector>
+
+#include "bus/BusFixture.h"
+#include "orvnebu/orvnebu.h"
+
+namespace OrvNebuBusTest {
+namespace {
+
+using ::testing::ElementsAre;
+
+// Device 0: chain 1 a 4-slave bus behind a foreign core, chain 2 a 2-slave bus, chain 3 a
+// master without slave positions, chain 4 two masters. Device 1 is a configuration
+// controller.
+const char* const BOARD = R"({ "devices": [
+  { "chains": {
+    "1": { "cores": [ { "type": 3 }, { "type": 14, "master": { "slaveCount": 4,
+           "slaves": { "0": { "memory": { "0x10": "0x0101" } } } } } ] },
+    "2": { "cores": [ { "type": 14, "master": { "slaveCount": 2,
+           "slaves": { "0": { "memory": { "0x10": "0x0202" } } } } } ] },
+    "3": { "cores": [ { "type": 14, "master": { "slaveCount": 0 } } ] },
+    "4": { "cores": [ { "type": 3 }, { "type": 14, "master": { "slaveCount": 3 } },
+                      { "type": 14, "master": { "slaveCount": 7 } } ] } } },
+  { "trellom": true, "chains": {
+    "1": { "cores": [ { "type": 14, "master": { "slaveCount": 2 } } ] } } } ] })";
+
+// The same board where chain 1 has a 2-slave master and device 1 is an ordinary device.
+const char* const BOARD_CHANGED = R"({ "devices": [
+  { "chains": {
+    "1": { "cores": [ { "type": 14, "master": { "slaveCount": 2 } } ] } } },
+  { "chains": {
+    "1": { "cores": [ { "type": 14, "master": { "slaveCount": 2 } } ] } } } ] })";
+
+// Chain 1 without a master.
+const char* const BOARD_NO_MASTER = R"({ "devices": [
+  { "chains": { "1": { "cores": [ { "type": 3 } ] } } } ] })";
+
+class BusListTest : public BusFixture {
+protected:
+    void SetUp() override {
+        BusFixture::SetUp();
+        loadBoard(BOARD);
+    }
+
+    uint32_t slaveCount(uint32_t handle, uint32_t device, uint32_t userChain) {
+        uint32_t count = 0xFFFFFFFFu;
+        EXPECT_EQ(OrvNebu_getSlaveCount(handle, device, userChain, &count), 0u) << joined();
+        return count;
+    }
+
+    // A call that needs the bus but no device access of its own: JTAG traffic means discovery.
+    uint32_t touch(uint32_t handle, uint32_t device, uint32_t userChain) {
+        uint32_t handles[1] = {0};
+        return OrvNebu_getSlaveHandles(handle, device, userChain, handles, 1);
+    }
+
+    size_t countLines(const std::string& prefix) const {
+        const auto lines = jtag();
+        return static_cast<size_t>(
+            std::count_if(lines.begin(), lines.end(),
+                          [&](const std::string& l) { return l.rfind(prefix, 0) == 0; }));
+    }
+};
+
+TEST_F(BusListTest, DiscoveryFindsTheMasterCountsItsSlavesAndResetsTheBus) {
+    EXPECT_EQ(slaveCount(1, 0, 1), 4u);
+    EXPECT_THAT(jtag(),
+                ElementsAre("jtag status device=0 chain=1 core=0 type=3",
+                            "jtag status device=0 chain=1 core=1 type=14",
+                            "jtag status device=0 chain=1 core=1 type=14", jtagWrite(1, 6, 0x3F),
+                            jtagWrite(1, 6, 0x3E), jtagRead(2, 4, 0x2), jtagWrite(1, 6, 0x00)));
+    EXPECT_TRUE(messages().empty());
+
+    // The bus is now known: no more device access to find it.
+    clearLog();
+    EXPECT_EQ(touch(1, 0, 1), 0u);
+    EXPECT_TRUE(jtag().empty());
+}
+
+TEST_F(BusListTest, TheLowerIndexedOfTwoMastersWins) {
+    EXPECT_EQ(slaveCount(1, 0, 4), 3u);
+    EXPECT_EQ(countLines("jtag status device=0 chain=4 core=2"), 0u) << "the scan stops";
+    // Its commands carry 3 + 2 reset bits.
+    EXPECT_EQ(countLines(jtagWrite(1, 5, 0x1F)), 1u) << joined();
+}
+
+TEST_F(BusListTest, TwoChainsAreTwoBuses) {
+    EXPECT_EQ(slaveCount(1, 0, 1), 4u);
+    EXPECT_EQ(slaveCount(1, 0, 2), 2u);
+    clearLog();
+
+    uint32_t word = 0;
+    ASSERT_EQ(OrvNebu_singleSlaveRead(1, {0, 1, 0}, 0x10, &word, nullptr), 0u);
+    EXPECT_EQ(word, 0x0101u);
+    ASSERT_EQ(OrvNebu_singleSlaveRead(1, {0, 2, 0}, 0x10, &word, nullptr), 0u);
+    EXPECT_EQ(word, 0x0202u);
+    ASSERT_EQ(OrvNebu_resetBus(1, 0, 2), 0u);
+    EXPECT_EQ(countLines(jtagWrite(1, 4, 0xF)), 1u);
+    EXPECT_EQ(countLines("jtag status device=0 chain=2"), 1u) << "no rediscovery";
+}
+
+TEST_F(BusListTest, SlaveCountRediscoversEveryTime) {
+    EXPECT_EQ(slaveCount(1, 0, 1), 4u);
+    clearLog();
+    EXPECT_EQ(slaveCount(1, 0, 1), 4u);
+    EXPECT_EQ(countLines("jtag status device=0 chain=1 core=0"), 1u);
+    EXPECT_EQ(countLines(jtagWrite(1, 6, 0x3F)), 1u) << "the new bus is reset again";
+
+    // The new object follows the board: chain 1 now has two slave positions.
+    loadBoard(BOARD_CHANGED);
+    EXPECT_EQ(slaveCount(1, 0, 1), 2u);
+    clearLog();
+    ASSERT_EQ(OrvNebu_resetBus(1, 0, 1), 0u);
+    EXPECT_EQ(countLines(jtagWrite(1, 4, 0xF)), 1u) << joined();
+}
+
+TEST_F(BusListTest, ABusThatDisappearsIsForgotten) {
+    EXPECT_EQ(slaveCount(1, 0, 1), 4u);
+    loadBoard(BOARD_NO_MASTER);
+    EXPECT_EQ(slaveCount(1, 0, 1), 0u);
+    clearLog();
+    EXPECT_EQ(OrvNebu_resetBus(1, 0, 1), FAILED);
+    expectOnlyMessage(256, "Invalid NEBU Bus Device:0, user chain number/bus:1.");
+}
+
+TEST_F(BusListTest, NoUsableBusCountsZeroAndCannotBeUsed) {
+    struct Case {
+        uint32_t device, userChain;
+        std::string message;
+    };
+    const Case cases[] = {
+        {0, 3, "Invalid NEBU Bus Device:0, user chain number/bus:3."},  // 0 slave positions
+        {0, 5, "Invalid NEBU Bus Device:0, user chain number/bus:5."},  // no cores
+        {1, 1, "Invalid NEBU Bus Device:1, user chain number/bus:1."},  // configuration controller
+        {4294967295u, 4000000000u,
+         "Invalid NEBU Bus Device:4294967295, user chain number/bus:4000000000."},  // no device
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.message);
+        clearLog();
+        EXPECT_EQ(slaveCount(1, c.device, c.userChain), 0u);
+        EXPECT_TRUE(messages().empty());
+        EXPECT_EQ(OrvNebu_resetBus(1, c.device, c.userChain), FAILED);
+        expectOnlyMessage(256, c.message);
+    }
+    // A configuration controller is never probed.
+    clearLog();
+    EXPECT_EQ(slaveCount(1, 1, 1), 0u);
+    EXPECT_TRUE(jtag().empty());
+}
+
+TEST_F(BusListTest, ABusWithoutPositionsReplacesAnEarlierOne) {
+    EXPECT_EQ(slaveCount(1, 0, 1), 4u);
+    const char* zero = R"({ "devices": [ { "chains": {
+        "1": { "cores": [ { "type": 14, "master": { "slaveCount": 0 } } ] } } } ] })";
+    loadBoard(zero);
+    EXPECT_EQ(slaveCount(1, 0, 1), 0u);
+    clearLog();
+    EXPECT_EQ(touch(1, 0, 1), FAILED);
+    expectOnlyMessage(256, "Invalid NEBU Bus Device:0, user chain number/bus:1.");
+}
+
+TEST_F(BusListTest, AConfigurationControllerLeavesTheListAlone) {
+    // Discovered while device 1 still was an ordinary device.
+    loadBoard(BOARD_CHANGED);
+    EXPECT_EQ(slaveCount(1, 1, 1), 2u);
+    loadBoard(BOARD);
+    EXPECT_EQ(slaveCount(1, 1, 1), 0u);
+    clearLog();
+    EXPECT_EQ(touch(1, 1, 1), 0u) << "the earlier bus is still listed";
+    EXPECT_TRUE(jtag().empty());
+}
+
+TEST_F(BusListTest, SessionsHaveTheirOwnBusesAndEndAlone) {
+    EXPECT_EQ(slaveCount(1, 0, 1), 4u);
+    EXPECT_EQ(slaveCount(2, 0, 1), 4u);
+    clearLog();
+    EXPECT_EQ(touch(1, 0, 1), 0u);
+    EXPECT_EQ(touch(2, 0, 1), 0u);
+    EXPECT_TRUE(jtag().empty());
+
+    // A notice is not an end.
+    OrvRT::OrvNebu_BusList::getBusList()->sessionNotice(1);
+    EXPECT_EQ(touch(1, 0, 1), 0u);
+    EXPECT_TRUE(jtag().empty());
+
+    OrvSim::endSession(1);
+    EXPECT_EQ(touch(2, 0, 1), 0u);
+    EXPECT_TRUE(jtag().empty()) << "session 2 keeps its bus";
+    EXPECT_EQ(touch(1, 0, 1), 0u);
+    EXPECT_EQ(countLines("jtag status device=0 chain=1 core=0"), 1u) << "session 1 discovers anew";
+}
+
+TEST_F(BusListTest, TheListRegistersAgainOnceItHasBeenEmptied) {
+    EXPECT_EQ(slaveCount(3, 0, 1), 4u);
+    OrvSim::endSession(3);  // the list is empty now
+    // A host that no longer knows the list: it must register again with its next bus.
+    freshHost(BOARD);
+    EXPECT_EQ(slaveCount(4, 0, 2), 2u);
+    OrvSim::endSession(4);
+    clearLog();
+    EXPECT_EQ(touch(4, 0, 2), 0u);
+    EXPECT_EQ(countLines("jtag status device=0 chain=2 core=0"), 2u) << joined();
+}
+
+TEST_F(BusListTest, AFailedResetKeepsTheNewBus) {
+    const char* stuck = R"({ "devices": [ { "chains": {
+        "1": { "cores": [ { "type": 14, "master": { "slaveCount": 1, "resetPolls": -1 } } ] }
+        } } ] })";
+    loadBoard(stuck);
+    uint32_t count = 77;
+    EXPECT_EQ(OrvNebu_getSlaveCount(1, 0, 1, &count), FAILED);
+    EXPECT_EQ(count, 77u);
+    expectOnlyMessage(256, "NEBU Master timed out.\n");
+    clearLog();
+    EXPECT_EQ(touch(1, 0, 1), 0u);
+    EXPECT_TRUE(jtag().empty()) << "found without a second reset";
+}
+
+}  // namespace
+}  // namespace OrvNebuBusTest

@@ -1,0 +1,222 @@
+// Register definition files: format edges, the printed image, every failure with its
+// messages, severities and line numbers, and the reference-counted handler cache.
+#include <sstream>
+
+#include "registers/OrvNebu_DefaultRegisterHandler.h"
+#include "support/RegsFixture.h"
+
+using OrvRT::OrvNebu_DefaultRegisterHandler;
+using OrvRT::OrvNebu_RegisterHandler;
+
+namespace {
+
+class RegisterFileTest : public RegsFixture {
+protected:
+    // The printed image of a file with this text.
+    std::string image(const std::string& text) {
+        data_.write("print.csv", text);
+        std::ostringstream out;
+        OrvNebu_DefaultRegisterHandler::readAndPrint(HANDLE, data_.path("print.csv"), out);
+        return out.str();
+    }
+
+    // Initializes slave 0 with this register file; returns the call's code.
+    uint32_t initializeWith(const std::string& text) {
+        data_.write("regs.csv", text);
+        clearMessages();
+        return initialize(0);
+    }
+
+    std::string parseError(uint32_t line, const std::string& text) {
+        return "Unable to parse file: " + data_.path("regs.csv") + " line:" + std::to_string(line) +
+               ": " + text + "\n";
+    }
+};
+
+TEST_F(RegisterFileTest, PrintedImageNormalisesTheColumns) {
+    EXPECT_EQ(image("name,addr,order,start,end,t6,acc,t8,inc\n"
+                    "A,10,0,0,7,x,rw,y,y,extra,more\n"
+                    "B,0b,1,3,0,,wr,,\n"
+                    "C,a0,2,0,0,,read/write,,N\n"
+                    "D,5,0,0,0,,,,yes\n"
+                    "E,0000f,0,1,1,,r,,y\n"
+                    "F,1,0,0,0,,w,,y\n"),
+              "name,addr,order,start,end,t6,acc,t8,inc\n"
+              "A,10,0,0,7,x,rw,y,y,more\n"
+              "B,0b,1,3,0,,rw,,y\n"
+              "C,a0,2,0,0,,rw,,y\n"
+              "D,5,0,0,0,,,,y\n"
+              "E,0f,0,1,1,,r,,y\n"
+              "F,1,0,0,0,,w,,y\n");
+    EXPECT_NO_MESSAGES();
+}
+
+TEST_F(RegisterFileTest, ExcludedLinesQuotesAndLineEnds) {
+    // 'n' anywhere in column 9 drops the line; it still counts for numbering.
+    EXPECT_EQ(image("h\nA,1,0,0,0,,,,n\nB,2,0,0,0,,,,no\nC,3,0,0,0,,,,yn\nD,4,0,0,0,,,,y\n"),
+              "h\nD,4,0,0,0,,,,y\n");
+    // Quotes are removed after the split; a quoted comma still splits.
+    EXPECT_EQ(image("h\n\"Q\",\"5\",\"0\",0,3,\"txt\",\"rw\",,y\n"), "h\nQ,5,0,0,3,txt,rw,,y\n");
+    EXPECT_EQ(image("h\nQ,5,0,0,3,\"a,b\",rw,,y\n"), "h\nQ,5,0,0,3,\"a,,rw,y,y\n");
+    // CR LF, and a last line without a line end, read the same.
+    const std::string expected = "h\nA,1,0,0,0,,rw,,y\nB,2,0,0,0,,rw,,y\n";
+    EXPECT_EQ(image("h\r\nA,1,0,0,0,,rw,,y\r\nB,2,0,0,0,,rw,,y\r\n"), expected);
+    EXPECT_EQ(image("h\nA,1,0,0,0,,rw,,y\nB,2,0,0,0,,rw,,y"), expected);
+    // The first line is never parsed.
+    EXPECT_EQ(image("A,1,0,0,0,,rw,,y\n"), "A,1,0,0,0,,rw,,y\n");
+    EXPECT_NO_MESSAGES();
+}
+
+TEST_F(RegisterFileTest, HeaderOnlyAndEmptyFilesHaveNoRegisters) {
+    for (const char* text : {"just a header\n", ""}) {
+        data_.write("empty.csv", text);
+        OrvNebu_RegisterHandler* h =
+            OrvNebu_DefaultRegisterHandler::getRegisterHandler(HANDLE, data_.path("empty.csv"));
+        ASSERT_NE(h, nullptr);
+        EXPECT_EQ(h->getRegisterCount(), 0u);
+        EXPECT_EQ(h->getMinAddress(), 0xFFFFFFFFu);
+        EXPECT_EQ(h->getMaxAddress(), 0u);
+        OrvNebu_DefaultRegisterHandler::releaseRegisterHandler(h);
+    }
+    EXPECT_EQ(image(""), "\n");
+    EXPECT_NO_MESSAGES();
+}
+
+TEST_F(RegisterFileTest, ShortAndEmptyLinesAreParseErrorsWithTheirLineNumbers) {
+    EXPECT_EQ(initializeWith("h\nA,1,0,0,0,,rw,,y\n\nB,2,0,0,0,,rw,,y\n"), ORVNEBU_FAILED);
+    auto m = messages();
+    ASSERT_EQ(m.size(), 2u);
+    EXPECT_EQ(m[0].severity, 512u);
+    EXPECT_EQ(m[0].text, parseError(3, ""));
+    EXPECT_EQ(m[1].severity, 32768u);
+    EXPECT_EQ(m[1].text, "Orv abort command");
+
+    // Two line feeds at the end: the empty last line is an error of its own.
+    EXPECT_EQ(initializeWith("h\nA,1,0,0,0,,rw,,y\n\n"), ORVNEBU_FAILED);
+    EXPECT_MESSAGE(512, parseError(3, ""));
+
+    EXPECT_EQ(initializeWith("h\r\nA,1,0,0,0,,rw,y\r\n"), ORVNEBU_FAILED);
+    EXPECT_MESSAGE(512, parseError(2, "A,1,0,0,0,,rw,y"));
+
+    // No slave object was made: the reference has none.
+    clearMessages();
+    ORV_HASHMAP_HANDLE map = makeMap();
+    EXPECT_EQ(getRegs(0, map), ORVNEBU_FAILED);
+    EXPECT_LAST_MESSAGE(256,
+                        "Data structures not initialized for OrvNebu slave Device:0, user chain "
+                        "number/bus:1, slave index:0.");
+}
+
+TEST_F(RegisterFileTest, BitsAndAddressesOutsideTheWordAreRefused) {
+    const std::string lines[] = {"X,1,0,0,32,,rw,,y", "X,1,0,40,3,,rw,,y", "X,1,0,-1,3,,rw,,y",
+                                 "X,20000,0,0,3,,rw,,y"};
+    const std::string reasons[] = {"Register bit out of range 0 to 31: start bit 0, end bit 32",
+                                   "Register bit out of range 0 to 31: start bit 40, end bit 3",
+                                   "Register bit out of range 0 to 31: start bit -1, end bit 3",
+                                   "Register address out of range 0 to 1ffff: 20000"};
+    for (size_t i = 0; i < 4; ++i) {
+        EXPECT_EQ(initializeWith("h\nOK,1,0,0,31,,rw,,y\n" + lines[i] + "\n"), ORVNEBU_FAILED);
+        auto m = messages();
+        ASSERT_EQ(m.size(), 3u) << lines[i];
+        EXPECT_EQ(m[0].severity, 512u);
+        EXPECT_EQ(m[0].text, reasons[i]);
+        EXPECT_EQ(m[1].severity, 512u);
+        EXPECT_EQ(m[1].text, parseError(3, lines[i]));
+        EXPECT_EQ(m[2].severity, 32768u);
+    }
+    // An excluded line is not looked at.
+    EXPECT_EQ(initializeWith("h\nX,1,0,0,99,,rw,,n\n"), ORVNEBU_OK);
+}
+
+TEST_F(RegisterFileTest, BadNumberIsReportedThenTheLine) {
+    EXPECT_EQ(initializeWith("h\nX,zz,0,0,3,,rw,,y\n"), ORVNEBU_FAILED);
+    auto m = messages();
+    ASSERT_EQ(m.size(), 3u);
+    EXPECT_EQ(m[0].severity, 256u);  // the conversion's own message
+    EXPECT_NE(m[0].text.find("zz"), std::string::npos);
+    EXPECT_EQ(m[1].severity, 512u);
+    EXPECT_EQ(m[1].text, parseError(2, "X,zz,0,0,3,,rw,,y"));
+    EXPECT_EQ(m[2].text, "Orv abort command");
+}
+
+TEST_F(RegisterFileTest, MissingFileIsReportedAndTheReferenceGivenBack) {
+    clearMessages();
+    EXPECT_EQ(initialize(6), ORVNEBU_FAILED);
+    auto m = messages();
+    ASSERT_EQ(m.size(), 2u);
+    EXPECT_EQ(m[0].severity, 256u);
+    EXPECT_EQ(m[0].text, "Unable to open OrvNebu register file: " + data_.path("missing.csv"));
+    EXPECT_EQ(m[1].severity, 32768u);
+    EXPECT_EQ(OrvNebu_DefaultRegisterHandler::getHandlerCount(), 0u);
+
+    std::ostringstream out;
+    EXPECT_THROW(
+        OrvNebu_DefaultRegisterHandler::readAndPrint(HANDLE, data_.path("missing.csv"), out),
+        std::logic_error);
+}
+
+TEST_F(RegisterFileTest, RegisterWithoutNameIsPrintedButCannotBeNamed) {
+    ASSERT_EQ(initializeWith("h\n,1,0,0,7,,rw,,y\nA,2,0,0,7,,rw,,y\n,3,0,0,7,,rw,,y\n"),
+              ORVNEBU_OK);
+    ORV_HASHMAP_HANDLE all = makeMap();
+    ASSERT_EQ(getRegs(0, all), ORVNEBU_OK);
+    EXPECT_EQ(mapOf(all).size(), 1u);
+    EXPECT_EQ(mapOf(all).count("A"), 1u);
+    EXPECT_EQ(image("h\n,1,0,0,7,,rw,,y\n"), "h\n,1,0,0,7,,rw,,y\n");
+}
+
+class RegisterCacheTest : public RegsFixture {};
+
+TEST_F(RegisterCacheTest, OneHandlerPerFileSharedUntilTheLastSlaveGoes) {
+    const std::string file = data_.path("regs.csv");
+    ASSERT_EQ(OrvNebu_DefaultRegisterHandler::getHandlerCount(), 0u);
+    EXPECT_EQ(OrvNebu_DefaultRegisterHandler::findRegisterHandler(HANDLE, ""), nullptr);
+    ASSERT_EQ(initialize(0), ORVNEBU_OK);
+    OrvNebu_RegisterHandler* shared =
+        OrvNebu_DefaultRegisterHandler::findRegisterHandler(HANDLE, file);
+    ASSERT_NE(shared, nullptr);
+    ASSERT_EQ(initialize(1), ORVNEBU_OK);
+    ASSERT_EQ(initialize(2), ORVNEBU_OK);  // another slave type naming the same file
+    EXPECT_EQ(OrvNebu_DefaultRegisterHandler::findRegisterHandler(HANDLE, file), shared);
+    EXPECT_EQ(OrvNebu_DefaultRegisterHandler::getHandlerCount(), 3u);
+
+    // A changed file is not read while any slave of the class still holds a handler.
+    data_.write("regs.csv", "h\nNEW,2,0,0,15,,rw,,y\n");
+    ASSERT_EQ(terminate(0), ORVNEBU_OK);
+    ASSERT_EQ(terminate(1), ORVNEBU_OK);
+    EXPECT_EQ(OrvNebu_DefaultRegisterHandler::findRegisterHandler(HANDLE, file), shared);
+    ASSERT_EQ(initialize(0), ORVNEBU_OK);
+    poke(2, 2, 0x2222);
+    ORV_HASHMAP_HANDLE old = makeMap({{"A", ""}});
+    ASSERT_EQ(getRegs(2, old), ORVNEBU_OK);
+    EXPECT_EQ(mapOf(old)["A"], "2222");
+
+    ASSERT_EQ(terminate(2), ORVNEBU_OK);
+    ASSERT_EQ(terminate(0), ORVNEBU_OK);
+    EXPECT_EQ(OrvNebu_DefaultRegisterHandler::getHandlerCount(), 0u);
+    EXPECT_EQ(OrvNebu_DefaultRegisterHandler::findRegisterHandler(HANDLE, file), nullptr);
+
+    ASSERT_EQ(initialize(0), ORVNEBU_OK);
+    poke(0, 2, 0x0BAD);
+    ORV_HASHMAP_HANDLE fresh = makeMap({{"NEW", ""}});
+    ASSERT_EQ(getRegs(0, fresh), ORVNEBU_OK);
+    EXPECT_EQ(mapOf(fresh)["NEW"], "0BAD");
+}
+
+TEST_F(RegisterCacheTest, PrintingAndLookupsCountNothing) {
+    const std::string file = data_.path("regs.csv");
+    std::ostringstream out;
+    OrvNebu_DefaultRegisterHandler::readAndPrint(HANDLE, file, out);
+    EXPECT_EQ(out.str(), REGS);
+    EXPECT_EQ(OrvNebu_DefaultRegisterHandler::getHandlerCount(), 0u);
+    EXPECT_EQ(OrvNebu_DefaultRegisterHandler::findRegisterHandler(HANDLE, file), nullptr);
+
+    // Ending the session removes its slaves, which give their references back.
+    ASSERT_EQ(initialize(0), ORVNEBU_OK);
+    ASSERT_EQ(initialize(1), ORVNEBU_OK);
+    OrvSim::endSession(HANDLE);
+    EXPECT_EQ(OrvNebu_DefaultRegisterHandler::getHandlerCount(), 0u);
+    EXPECT_EQ(OrvNebu_DefaultRegisterHandler::findRegisterHandler(HANDLE, file), nullptr);
+}
+
+}  // namespace

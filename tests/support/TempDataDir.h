@@ -1,0 +1,35 @@
+// A throwaway data directory for tests that need their own definition files.
+#pragma once
+
+#include <cstdlib>
+#include <filesystem>
+#include <fstream>
+#include <string>
+
+class TempDataDir {
+public:
+    TempDataDir() {
+        std::string pattern =
+            (std::filesystem::temp_directory_path() / "nebu-data-XXXXXX").string();
+        if (mkdtemp(pattern.data()) == nullptr) throw std::runtime_error("mkdtemp failed");
+        path_ = pattern;
+    }
+    ~TempDataDir() {
+        std::error_code ignored;
+        std::filesystem::remove_all(path_, ignored);
+    }
+    TempDataDir(const TempDataDir&) = delete;
+    TempDataDir& operator=(const TempDataDir&) = delete;
+
+    // The directory with a trailing separator, as the host hands it out.
+    std::string dir() const { return path_ + "/"; }
+    std::string path(const std::string& name) const { return path_ + "/" + name; }
+    // Writes the text as it stands (no line end added).
+    void write(const std::string& name, const std::string& text) const {
+        std::ofstream out(path(name), std::ios::binary | std::ios::trunc);
+        out << text;
+    }
+
+private:
+    std::string path_;
+};
