@@ -4,11 +4,59 @@
 
 #include <algorithm>
 #include <cstdlib>
+#include <set>
+#include <stdexcept>
+#include <string>
+#include <vector>
 
+#include "params/OrvNebu_DefaultParamReader.h"
 #include "registers/OrvNebu_DefaultRegisterHandler.h"
 #include "registers/OrvNebu_SingleRegisterHandler.h"
 
 namespace OrvRT {
+
+namespace {
+
+typedef std::vector<OrvNebu_ParamAction*> ActionList;
+
+bool byPriority(OrvNebu_ParamAction* a, OrvNebu_ParamAction* b) {
+    return a->getPriority() < b->getPriority();
+}
+
+// The actions that serve the names of the map, each once, in ascending priority; actions of
+// equal priority in the order of their smallest requested name.
+ActionList requestedActions(OrvNebu_DefaultSlave& slave, const Orv_HashMapCStr& params) {
+    std::set<std::string> pending;
+    for (const auto& entry : params) pending.insert(entry.first);
+    ActionList list;
+    while (!pending.empty()) {
+        const std::string name = *pending.begin();
+        OrvNebu_ParamAction* action = slave.getParamAction(name);
+        if (action == nullptr) {
+            throw std::logic_error("OrvNebu_getParameter() - Unknown parameter name '" + name +
+                                   "'");
+        }
+        // An action stored under a name its own list lacks must neither be taken twice nor
+        // keep that name pending for ever.
+        pending.erase(name);
+        if (std::find(list.begin(), list.end(), action) != list.end()) continue;
+        list.push_back(action);
+        for (const std::string& served : *action->getParamNames()) pending.erase(served);
+    }
+    if (list.size() > 1) std::stable_sort(list.begin(), list.end(), byPriority);
+    return list;
+}
+
+// Every entry of the map (an action under several names once per name), by priority.
+ActionList allActions(const OrvNebu_ActionsMap& actions) {
+    ActionList list;
+    list.reserve(actions.size());
+    for (const auto& entry : actions) list.push_back(entry.second);
+    std::stable_sort(list.begin(), list.end(), byPriority);
+    return list;
+}
+
+}  // namespace
 
 OrvNebu_Slave* OrvNebu_DefaultSlave::create(uint32_t handle, const ORV_CORE_INFO& coreInfo,
                                             const ORV_SLAVE_REF& slaveRef,
@@ -59,9 +107,10 @@ void OrvNebu_DefaultSlave::init(uint32_t handle, const std::string& registerFile
         singleRegisterHandler_
             ? OrvNebu_SingleRegisterHandler::getRegisterHandler(handle, registerFile)
             : OrvNebu_DefaultRegisterHandler::getRegisterHandler(handle, registerFile);
-    // Parameter side: this slave class serves no parameters yet, so the parameter file is
-    // not read and the actions map stays empty.
-    (void)parameterFile;
+    if (!parameterFile.empty()) {
+        OrvNebu_DefaultParamReader::addToHashMap(handle, parameterFile, actions_);
+        addToActionsHashMap(handle, actions_);
+    }
 }
 
 void OrvNebu_DefaultSlave::getRegisters(uint32_t handle, const ORV_SLAVE_REF& slaveRef,
@@ -76,18 +125,43 @@ void OrvNebu_DefaultSlave::setRegisters(uint32_t handle, const ORV_SLAVE_REF& sl
 
 void OrvNebu_DefaultSlave::setParameters(uint32_t handle, const ORV_SLAVE_REF& slaveRef,
                                          Orv_HashMapCStr* params) {
-    OrvNebu_Slave::setParameters(handle, slaveRef, params);
+    Orv_HashMapCStr registers(100);
+    setParametersInRegisterHashMap(handle, params, &registers);
+    setRegisters(handle, slaveRef, &registers);
 }
 
 void OrvNebu_DefaultSlave::getParameters(uint32_t handle, const ORV_SLAVE_REF& slaveRef,
                                          Orv_HashMapCStr* params) {
-    OrvNebu_Slave::getParameters(handle, slaveRef, params);
+    Orv_HashMapCStr registers(100);
+    const bool allParams = params->empty();
+    const ActionList list = allParams ? allActions(actions_) : requestedActions(*this, *params);
+    for (OrvNebu_ParamAction* action : list) action->getRegsToRead(registers);
+    getRegisters(handle, slaveRef, &registers);
+    for (OrvNebu_ParamAction* action : list) {
+        action->readRegsAndUpdateParams(allParams, registers, *params);
+    }
 }
 
 void OrvNebu_DefaultSlave::getParameterChoices(uint32_t handle, const ORV_SLAVE_REF& slaveRef,
                                                Orv_HashMapCStr* params,
                                                std::vector<std::string>* choices) {
-    OrvNebu_Slave::getParameterChoices(handle, slaveRef, params, choices);
+    (void)handle;
+    (void)slaveRef;
+    if (params->empty()) {
+        throw std::logic_error(
+            "OrvNebu_getParameterChoices(): 'params' argument has no parameter name passed in.");
+    }
+    const std::string& name = params->begin()->first;
+    OrvNebu_ParamAction* action = getParamAction(name);
+    if (action == nullptr) {
+        throw std::logic_error("OrvNebu_getParameterChoices(): param '" + name +
+                               "' is not a valid parameter.");
+    }
+    if (!action->isChoiceParam()) {
+        throw std::logic_error("OrvNebu_getParameterChoices(): param '" + name +
+                               "' is not a choice parameter.");
+    }
+    action->getChoices(params, *choices);
 }
 
 OrvNebu_ParamAction* OrvNebu_DefaultSlave::getParamAction(const std::string& name) {
@@ -97,8 +171,10 @@ OrvNebu_ParamAction* OrvNebu_DefaultSlave::getParamAction(const std::string& nam
 
 void OrvNebu_DefaultSlave::setParametersInRegisterHashMap(uint32_t handle, Orv_HashMapCStr* params,
                                                           Orv_HashMapCStr* registers) {
-    (void)registers;
-    OrvNebu_Slave::setParameters(handle, getSlaveRef(), params);
+    (void)handle;
+    for (OrvNebu_ParamAction* action : requestedActions(*this, *params)) {
+        action->setParams(*params, *registers);
+    }
 }
 
 void OrvNebu_DefaultSlave::addToActionsHashMap(uint32_t handle, OrvNebu_ActionsMap& actions) {

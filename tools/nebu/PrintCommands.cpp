@@ -3,6 +3,7 @@
 
 #include <ostream>
 
+#include "params/OrvNebu_DefaultParamReader.h"
 #include "registers/OrvNebu_DefaultRegisterHandler.h"
 
 namespace nebu {
@@ -18,10 +19,15 @@ int printRegisterFile(uint32_t handle, const std::string& path, std::ostream& ou
     }
 }
 
-int printParameterFile(uint32_t /*handle*/, const std::string& /*path*/, std::ostream& /*out*/,
-                       std::ostream& err) {
-    err << "nebu: printParameterFile is not available yet" << std::endl;
-    return 2;
+int printParameterFile(uint32_t /*handle*/, const std::string& path, std::ostream& out,
+                       std::ostream& /*err*/) {
+    // The reader reports its failures on session 0, the session it caches the file under.
+    try {
+        OrvRT::OrvNebu_DefaultParamReader::readAndPrint(path, out);
+        return 0;
+    } catch (...) {
+        return 1;
+    }
 }
 
 }  // namespace nebu

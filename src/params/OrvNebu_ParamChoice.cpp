@@ -1,0 +1,19 @@
+// Printing of one choice.
+#include "params/OrvNebu_ParamChoice.h"
+
+#include "host/OrvUtil.h"
+#include "params/OrvNebu_ParamChoiceAction.h"
+
+namespace OrvRT {
+
+void OrvNebu_ParamChoice::toCSVFile(std::ostream& out,
+                                    const OrvNebu_ParamChoiceAction& action) const {
+    out << choiceName_;
+    std::string bits;
+    for (const RegValue& setting : regValueList_) {
+        Orv_NumberUtil::hexStr2BinStr(setting.second, action.getRegWidth(setting.first), bits);
+        out << ',' << setting.first << '=' << bits;
+    }
+}
+
+}  // namespace OrvRT

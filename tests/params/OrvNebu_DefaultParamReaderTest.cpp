@@ -1,0 +1,362 @@
+// Parameter definition files: the row format, every message, the per-session cache, printing.
+#include <gtest/gtest.h>
+
+#include <atomic>
+#include <cstring>
+#include <filesystem>
+#include <fstream>
+#include <sstream>
+#include <stdexcept>
+#include <string>
+#include <thread>
+#include <vector>
+
+#include "base/Orv_AbortException.h"
+#include "hostsim/Sim.h"
+#include "params/OrvNebu_DefaultParamReader.h"
+#include "support/TestHost.h"
+
+using OrvRT::Orv_AbortException;
+using OrvRT::OrvNebu_ActionsMap;
+using OrvRT::OrvNebu_DefaultParamReader;
+using OrvRT::OrvNebu_ParamChoiceAction;
+
+namespace {
+
+struct Said {
+    uint32_t handle;
+    uint32_t severity;
+    std::string text;
+    bool operator==(const Said& o) const {
+        return handle == o.handle && severity == o.severity && text == o.text;
+    }
+};
+
+std::ostream& operator<<(std::ostream& os, const Said& m) {
+    return os << "{" << m.handle << ", " << m.severity << ", \"" << m.text << "\"}";
+}
+
+class ParamReader : public TestHost {
+protected:
+    static constexpr uint32_t SESSION = 41;
+    static constexpr uint32_t OTHER_SESSION = 42;
+
+    void SetUp() override {
+        TestHost::SetUp();
+        dir_ = std::filesystem::temp_directory_path() /
+               ("nebu_params_" + std::to_string(::testing::UnitTest::GetInstance()->random_seed()) +
+                "_" + ::testing::UnitTest::GetInstance()->current_test_info()->name());
+        std::filesystem::create_directories(dir_);
+    }
+
+    void TearDown() override {
+        for (uint32_t h : {0u, SESSION, OTHER_SESSION}) OrvSim::endSession(h);
+        TestHost::TearDown();
+        std::error_code ec;
+        std::filesystem::remove_all(dir_, ec);
+    }
+
+    std::string write(const std::string& name, const std::string& content) {
+        const std::string path = (dir_ / name).string();
+        std::ofstream(path, std::ios::binary) << content;
+        return path;
+    }
+
+    OrvNebu_ActionsMap load(const std::string& path, uint32_t handle = SESSION) {
+        OrvNebu_ActionsMap actions;
+        OrvNebu_DefaultParamReader::addToHashMap(handle, path, actions);
+        return actions;
+    }
+
+    static OrvNebu_ParamChoiceAction& choice(OrvNebu_ActionsMap& actions, const std::string& n) {
+        EXPECT_EQ(1u, actions.count(n)) << n;
+        return *static_cast<OrvNebu_ParamChoiceAction*>(actions.at(n));
+    }
+
+    // Loading must fail with Orv_AbortException after exactly these messages.
+    void expectRejected(const std::string& path, const std::vector<Said>& expected) {
+        clearMessages();
+        const size_t cached = OrvNebu_DefaultParamReader::cachedFileCount(SESSION);
+        EXPECT_THROW(load(path), Orv_AbortException);
+        EXPECT_EQ(expected, said());
+        EXPECT_EQ(cached, OrvNebu_DefaultParamReader::cachedFileCount(SESSION));
+    }
+
+    Said parseError(const std::string& path, uint32_t line, const std::string& row) {
+        return {SESSION, 512,
+                "Unable to parse file: " + path + " line:" + std::to_string(line) + ": " + row};
+    }
+
+    // Every message so far, with its session.
+    std::vector<Said> said() const {
+        std::vector<Said> all;
+        for (const TestHost::Message& m : messages()) all.push_back({m.handle, m.severity, m.text});
+        return all;
+    }
+
+    std::filesystem::path dir_;
+};
+
+const char* const MODE_FILE =
+    "param,index,choice,settings\n"
+    "MODE,0,Off,EN=0\n"
+    "MODE,1,On,EN=1,SEL=01\n"
+    "LEVEL,0,Low,LVL=0000\n"
+    "LEVEL,1,High,LVL=1111\n";
+
+}  // namespace
+
+TEST_F(ParamReader, RowsBecomeChoiceActionsWithLinePriorities) {
+    const std::string path = write("p.csv", MODE_FILE);
+    OrvNebu_ActionsMap actions = load(path);
+    EXPECT_NO_MESSAGES();
+    ASSERT_EQ(2u, actions.size());
+    OrvNebu_ParamChoiceAction& mode = choice(actions, "MODE");
+    OrvNebu_ParamChoiceAction& level = choice(actions, "LEVEL");
+    EXPECT_EQ(10002u, mode.getPriority());
+    EXPECT_EQ(10004u, level.getPriority());
+    ASSERT_EQ(2u, mode.getChoiceList().size());
+    EXPECT_EQ("On", mode.getChoiceList()[1].getChoiceName());
+    using RV = OrvRT::OrvNebu_ParamChoice::RegValueList;
+    EXPECT_EQ((RV{{"EN", "1"}, {"SEL", "1"}}), mode.getChoiceList()[1].getRegValueList());
+    EXPECT_EQ(2u, mode.getRegWidth("SEL"));
+    EXPECT_EQ((RV{{"LVL", "F"}}), level.getChoiceList()[1].getRegValueList());
+    EXPECT_EQ(4u, level.getRegWidth("LVL"));
+}
+
+TEST_F(ParamReader, LineEndingsQuotesAndEmptyFields) {
+    // Carriage returns are dropped, the last line needs no line feed, quotes come off after
+    // the split, empty setting fields are skipped.
+    const std::string path = write("p.csv",
+                                   "hdr\r\n"
+                                   "\"A\",0,\"x\",,EN=1,\r\n"
+                                   "A,1,y,\r\n"
+                                   "A,2,z,EN=");
+    OrvNebu_ActionsMap actions = load(path);
+    EXPECT_NO_MESSAGES();
+    OrvNebu_ParamChoiceAction& a = choice(actions, "A");
+    ASSERT_EQ(3u, a.getChoiceList().size());
+    EXPECT_EQ("x", a.getChoiceList()[0].getChoiceName());
+    EXPECT_EQ(1u, a.getChoiceList()[0].getRegValueList().size());
+    EXPECT_TRUE(a.getChoiceList()[1].getRegValueList().empty());
+    // EN= is three characters: accepted, width 0 (the first width of EN, 1, stays).
+    ASSERT_EQ(1u, a.getChoiceList()[2].getRegValueList().size());
+    EXPECT_EQ("", a.getChoiceList()[2].getRegValueList()[0].second);
+    EXPECT_EQ(1u, a.getRegWidth("EN"));
+
+    // A comma inside quotes still splits: "On,Fast" becomes two fields.
+    const std::string quoted = write("q.csv", "h\nB,0,\"On,Fast\",EN=1\n");
+    expectRejected(quoted, {parseError(quoted, 2, "B,0,\"On,Fast\",EN=1")});
+}
+
+TEST_F(ParamReader, MalformedRows) {
+    struct Case {
+        const char* name;
+        std::string content;
+        uint32_t line;
+        std::string row;
+    };
+    const std::vector<Case> cases = {
+        {"three fields", "h\nMODE,0,Off,EN=0\nMODE,1,On\n", 3, "MODE,1,On"},
+        {"empty line", "h\nMODE,0,Off,EN=0\n\nMODE,1,On,EN=1\n", 3, ""},
+        {"empty line with CR", "h\r\nMODE,0,Off,EN=0\r\n\r\n", 3, ""},
+        {"short setting", "h\nMODE,0,Off,E=\n", 2, "MODE,0,Off,E="},
+        {"setting without =", "h\nMODE,0,Off,EN0\n", 2, "MODE,0,Off,EN0"},
+        // Nothing to take the choice: reported, not run into a missing action.
+        {"empty first name", "h\n,0,Off,EN=0\n", 2, ",0,Off,EN=0"},
+        {"quoted empty first name", "h\n\"\",0,Off,EN=0\n", 2, "\"\",0,Off,EN=0"},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.name);
+        const std::string path = write("bad.csv", c.content);
+        expectRejected(path, {parseError(path, c.line, c.row)});
+    }
+}
+
+TEST_F(ParamReader, ChoiceIndexErrorsAreReportedTwice) {
+    const std::string gap = write("gap.csv", "h\nMODE,0,Off,EN=0\nMODE,2,On,EN=1\n");
+    expectRejected(
+        gap, {{SESSION, 256, "choice_index out-of-order"}, parseError(gap, 3, "MODE,2,On,EN=1")});
+
+    const std::string start = write("start.csv", "h\nMODE,1,Off,EN=0\n");
+    expectRejected(start, {{SESSION, 256, "choice_index out-of-order"},
+                           parseError(start, 2, "MODE,1,Off,EN=0")});
+
+    // Indexes are read like atoi: blanks and a sign, digits up to the first other character.
+    const std::string atoiLike = write("atoi.csv", "h\nM,  +0x,a,\nM,1st,b,\nM,-1,c,\n");
+    expectRejected(atoiLike, {{SESSION, 256, "choice_index out-of-order"},
+                              parseError(atoiLike, 4, "M,-1,c,")});
+
+    // An index too large for any integer fails the order check, no overflow.
+    const std::string huge = write("huge.csv", "h\nM,0,a,\nM,99999999999999999999999,b,\n");
+    expectRejected(huge, {{SESSION, 256, "choice_index out-of-order"},
+                          parseError(huge, 3, "M,99999999999999999999999,b,")});
+}
+
+TEST_F(ParamReader, BadBitsAreReportedWithTheRow) {
+    const std::string path = write("bits.csv", "h\nMODE,0,Off,EN=2\n");
+    clearMessages();
+    EXPECT_THROW(load(path), Orv_AbortException);
+    const std::vector<Said> messages = said();
+    ASSERT_EQ(2u, messages.size());
+    EXPECT_EQ(256u, messages[0].severity);
+    // The conversion's own message, naming the bad digits.
+    EXPECT_NE(std::string::npos, messages[0].text.find('2')) << messages[0].text;
+    EXPECT_EQ(parseError(path, 2, "MODE,0,Off,EN=2"), messages[1]);
+}
+
+TEST_F(ParamReader, MissingFileOrDirectory) {
+    for (const std::string& path : {(dir_ / "absent.csv").string(), dir_.string()}) {
+        clearMessages();
+        const std::string text = "Unable to open OrvNebu parameter file: " + path;
+        try {
+            load(path);
+            ADD_FAILURE() << "no exception for " << path;
+        } catch (const Orv_AbortException&) {
+            ADD_FAILURE() << "abort instead of the open failure";
+        } catch (const std::logic_error& e) {
+            EXPECT_EQ(text, e.what());
+        }
+        EXPECT_EQ((std::vector<Said>{{SESSION, 256, text}}), said());
+    }
+    EXPECT_EQ(0u, OrvNebu_DefaultParamReader::cachedFileCount(SESSION));
+}
+
+TEST_F(ParamReader, HeaderOnlyAndEmptyFilesAreCachedEmpty) {
+    for (const char* content : {"param,index,choice\n", "param,index,choice", ""}) {
+        const std::string path =
+            write(std::string("h") + std::to_string(std::strlen(content)), content);
+        EXPECT_TRUE(load(path).empty());
+    }
+    EXPECT_NO_MESSAGES();
+    EXPECT_EQ(3u, OrvNebu_DefaultParamReader::cachedFileCount(SESSION));
+}
+
+TEST_F(ParamReader, RepeatedNameKeepsTheFirstAndAMapEntryIsNeverReplaced) {
+    const std::string path = write("rep.csv",
+                                   "h\n"
+                                   "MODE,0,Off,EN=0\n"
+                                   "LEVEL,0,Low,LVL=0\n"
+                                   "MODE,0,Again,EN=1\n");
+    OrvNebu_ActionsMap actions = load(path);
+    EXPECT_NO_MESSAGES();
+    EXPECT_EQ(10002u, choice(actions, "MODE").getPriority());
+    EXPECT_EQ("Off", choice(actions, "MODE").getChoiceList()[0].getChoiceName());
+
+    OrvRT::OrvNebu_ParamChoiceAction mine("LEVEL", 1);
+    OrvNebu_ActionsMap preset{{"LEVEL", &mine}};
+    OrvNebu_DefaultParamReader::addToHashMap(SESSION, path, preset);
+    EXPECT_EQ(&mine, preset.at("LEVEL"));
+    EXPECT_EQ(2u, preset.size());
+}
+
+TEST_F(ParamReader, SharedWithinASessionReadAgainInAnother) {
+    const std::string path = write("p.csv", MODE_FILE);
+    OrvNebu_ActionsMap first = load(path);
+    // Changed on disk: the session keeps what it read, another session reads the new file.
+    write("p.csv", "h\nMODE,0,Only,\n");
+    OrvNebu_ActionsMap second = load(path);
+    EXPECT_EQ(first, second);
+    EXPECT_EQ(2u, choice(second, "MODE").getChoiceList().size());
+
+    OrvNebu_ActionsMap other = load(path, OTHER_SESSION);
+    EXPECT_NE(first.at("MODE"), other.at("MODE"));
+    EXPECT_EQ(1u, choice(other, "MODE").getChoiceList().size());
+    EXPECT_EQ(0u, other.count("LEVEL"));
+    EXPECT_EQ(1u, OrvNebu_DefaultParamReader::cachedFileCount(SESSION));
+    EXPECT_EQ(1u, OrvNebu_DefaultParamReader::cachedFileCount(OTHER_SESSION));
+}
+
+TEST_F(ParamReader, AFailedReadCachesNothingAndIsRetried) {
+    const std::string path = write("p.csv", "h\nMODE,0,Off\n");
+    expectRejected(path, {parseError(path, 2, "MODE,0,Off")});
+    write("p.csv", MODE_FILE);
+    EXPECT_EQ(2u, load(path).size());
+}
+
+TEST_F(ParamReader, SessionEndErasesOnlyThatSession) {
+    const std::string a = write("a.csv", MODE_FILE);
+    const std::string b = write("b.csv", "h\nB,0,x,\n");
+    load(a);
+    load(b);
+    load(a, OTHER_SESSION);
+    std::ostringstream sink;
+    OrvNebu_DefaultParamReader::readAndPrint(a, sink);
+    EXPECT_EQ(2u, OrvNebu_DefaultParamReader::cachedFileCount(SESSION));
+    EXPECT_EQ(1u, OrvNebu_DefaultParamReader::cachedFileCount(0));
+
+    OrvSim::endSession(SESSION);
+    EXPECT_EQ(0u, OrvNebu_DefaultParamReader::cachedFileCount(SESSION));
+    EXPECT_EQ(1u, OrvNebu_DefaultParamReader::cachedFileCount(OTHER_SESSION));
+    EXPECT_EQ(1u, OrvNebu_DefaultParamReader::cachedFileCount(0));
+
+    // The next use reads the file afresh.
+    write("a.csv", "h\nNEW,0,x,\n");
+    OrvNebu_ActionsMap again = load(a);
+    EXPECT_EQ(1u, again.count("NEW"));
+    EXPECT_EQ(1u, load(a, OTHER_SESSION).count("MODE"));
+}
+
+TEST_F(ParamReader, PrintsTheFileBackAndAgainFromTheCache) {
+    const std::string path = write("p.csv",
+                                   "Param,Index,Choice,Settings\r\n"
+                                   "MODE,0,Off,EN=0\n"
+                                   "\"MODE\",1,On,EN=1,,SEL=01\n"
+                                   "WIDE,0,w,R=000101\n"
+                                   "WIDE,1,v,R=11\n"
+                                   "EMPTY,0,none,\n");
+    const std::string image =
+        "Param,Index,Choice,Settings\n"
+        "MODE,0,Off,EN=0\n"
+        "MODE,1,On,EN=1,SEL=01\n"
+        "WIDE,0,w,R=000101\n"
+        "WIDE,1,v,R=000011\n"
+        "EMPTY,0,none\n";
+    std::ostringstream out;
+    OrvNebu_DefaultParamReader::readAndPrint(path, out);
+    EXPECT_EQ(image, out.str());
+    EXPECT_NO_MESSAGES();
+
+    // Printed from the cache (session 0): the file is not read again, the header is kept.
+    write("p.csv", "Other\nX,0,y,\n");
+    std::ostringstream again;
+    OrvNebu_DefaultParamReader::readAndPrint(path, again);
+    EXPECT_EQ(image, again.str());
+
+    // Failures are reported on session 0.
+    clearMessages();
+    const std::string bad = write("bad.csv", "h\nM,0,a\n");
+    std::ostringstream none;
+    EXPECT_THROW(OrvNebu_DefaultParamReader::readAndPrint(bad, none), Orv_AbortException);
+    EXPECT_EQ((std::vector<Said>{{0, 512, "Unable to parse file: " + bad + " line:2: M,0,a"}}),
+              said());
+}
+
+TEST_F(ParamReader, SessionsMayReadAndEndAtTheSameTime) {
+    // Each session is serialised by its own target lock only: one session may read a file
+    // into the cache while the host ends another.
+    const std::string path = write("p.csv", MODE_FILE);
+    constexpr uint32_t FIRST = 5000;
+    constexpr uint32_t COUNT = 400;
+    // The host ends only sessions whose calls have returned.
+    std::atomic<uint32_t> finished(0);
+    std::atomic<bool> done(false);
+    std::thread ender([&] {
+        for (uint32_t k = 0; !done; ++k) {
+            const uint32_t n = finished;
+            if (n != 0) OrvSim::endSession(FIRST + k % n);
+        }
+    });
+    size_t loaded = 0;
+    for (uint32_t i = 0; i < COUNT; ++i) {
+        loaded += load(path, FIRST + i).size();
+        finished = i + 1;
+    }
+    done = true;
+    ender.join();
+    EXPECT_EQ(2u * COUNT, loaded);
+    for (uint32_t i = 0; i < COUNT; ++i) OrvSim::endSession(FIRST + i);
+    for (uint32_t i = 0; i < COUNT; ++i) {
+        ASSERT_EQ(0u, OrvNebu_DefaultParamReader::cachedFileCount(FIRST + i));
+    }
+}

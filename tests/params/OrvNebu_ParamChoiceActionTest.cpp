@@ -1,0 +1,155 @@
+// Choice parameters: building, matching register values, setting choices, listing, printing.
+#include <gtest/gtest.h>
+
+#include <functional>
+#include <sstream>
+#include <stdexcept>
+#include <string>
+#include <vector>
+
+#include "params/OrvNebu_ParamChoiceAction.h"
+
+using OrvRT::Orv_HashMapCStr;
+using OrvRT::OrvNebu_ParamChoiceAction;
+
+namespace {
+
+std::string logicErrorOf(const std::function<void()>& f) {
+    try {
+        f();
+    } catch (const std::logic_error& e) {
+        return e.what();
+    }
+    return "<nothing thrown>";
+}
+
+// MODE: Off (EN=0), On (EN=1, SEL=01), Fast (EN=1, SEL=10), Same (EN=1, SEL=01 again).
+OrvNebu_ParamChoiceAction makeMode() {
+    OrvNebu_ParamChoiceAction mode("MODE", 10002);
+    mode.addChoice("Off", 0);
+    mode.addChoiceRegSetting(0, 1, "EN", "0");
+    mode.addChoice("On", 1);
+    mode.addChoiceRegSetting(1, 1, "EN", "1");
+    mode.addChoiceRegSetting(1, 2, "SEL", "1");
+    mode.addChoice("Fast", 2);
+    mode.addChoiceRegSetting(2, 1, "EN", "1");
+    mode.addChoiceRegSetting(2, 2, "SEL", "2");
+    mode.addChoice("Same", 3);
+    mode.addChoiceRegSetting(3, 1, "EN", "1");
+    mode.addChoiceRegSetting(3, 2, "SEL", "1");
+    return mode;
+}
+
+std::string readMode(OrvNebu_ParamChoiceAction& action, Orv_HashMapCStr registers) {
+    Orv_HashMapCStr params;
+    params[action.getParamName()] = "stale";
+    action.readRegsAndUpdateParams(false, registers, params);
+    EXPECT_EQ(1u, params.size());
+    return params[action.getParamName()];
+}
+
+}  // namespace
+
+TEST(ParamChoiceAction, ChoiceIndexesMustRunInOrder) {
+    OrvNebu_ParamChoiceAction a("P", 10002);
+    // A setting before any choice has no last choice to go to.
+    EXPECT_EQ("choice_index corrupt",
+              logicErrorOf([&] { a.addChoiceRegSetting(0xFFFFFFFFu, 1, "R", "1"); }));
+    EXPECT_EQ("choice_index corrupt", logicErrorOf([&] { a.addChoiceRegSetting(0, 1, "R", "1"); }));
+    EXPECT_EQ("choice_index out-of-order", logicErrorOf([&] { a.addChoice("B", 1); }));
+    EXPECT_TRUE(a.getChoiceList().empty());
+
+    a.addChoice("A", 0);
+    EXPECT_EQ("choice_index out-of-order", logicErrorOf([&] { a.addChoice("A2", 0); }));
+    a.addChoice("B", 1);
+    EXPECT_EQ("choice_index corrupt", logicErrorOf([&] { a.addChoiceRegSetting(0, 4, "R", "F"); }));
+    EXPECT_EQ("choice_index corrupt", logicErrorOf([&] { a.addChoiceRegSetting(2, 4, "R", "F"); }));
+    // The failed calls left nothing behind.
+    ASSERT_EQ(2u, a.getChoiceList().size());
+    EXPECT_TRUE(a.getChoiceList()[0].getRegValueList().empty());
+    EXPECT_TRUE(a.getChoiceList()[1].getRegValueList().empty());
+    EXPECT_EQ(0u, a.getRegWidth("R"));
+
+    a.addChoiceRegSetting(1, 4, "R", "F");
+    EXPECT_EQ(4u, a.getRegWidth("R"));
+    // Asking for a register no choice sets does not make it one to read.
+    EXPECT_EQ(0u, a.getRegWidth("UNKNOWN"));
+    OrvRT::Orv_HashMapCStr registers;
+    a.getRegsToRead(registers);
+    EXPECT_EQ((OrvRT::Orv_HashMapCStr{{"R", ""}}), registers);
+}
+
+TEST(ParamChoiceAction, HexValueComparison) {
+    struct Case {
+        const char* a;
+        const char* b;
+        bool equal;
+    };
+    const Case cases[] = {
+        {"0x001F", "1f", true}, {"0x001F", "001F", true}, {"1f", "001F", true},
+        {"0X1f", "0x1F", true}, {"0", "", true},          {"0x0", "", true},
+        {"000", "0", true},     {"0x", "", true},         {"1", "01", true},
+        {"1", "10", false},     {"1f", "1e", false},      {" 1", "1", false},
+        {"0x0x1", "1", false},  {"00x1", "1", false},     {"ABC", "abc", true},
+    };
+    for (const Case& c : cases) {
+        EXPECT_EQ(c.equal, OrvNebu_ParamChoiceAction::hexValuesEqual(c.a, c.b))
+            << c.a << " vs " << c.b;
+        EXPECT_EQ(c.equal, OrvNebu_ParamChoiceAction::hexValuesEqual(c.b, c.a))
+            << c.b << " vs " << c.a;
+    }
+}
+
+// The board-level engine tests cover the common cases; these are the corners.
+TEST(ParamChoiceAction, ReadingCorners) {
+    OrvNebu_ParamChoiceAction mode = makeMode();
+    // A register missing from the map reads as empty, which equals 0.
+    EXPECT_EQ("Off", readMode(mode, {}));
+    EXPECT_EQ("On", readMode(mode, {{"EN", "0x1"}, {"SEL", "0x0001"}}));
+
+    // The first match in index order wins even when a later choice matches more settings.
+    OrvNebu_ParamChoiceAction subset("S", 10002);
+    subset.addChoice("Enabled", 0);
+    subset.addChoiceRegSetting(0, 1, "EN", "1");
+    subset.addChoice("EnabledFast", 1);
+    subset.addChoiceRegSetting(1, 1, "EN", "1");
+    subset.addChoiceRegSetting(1, 1, "FAST", "1");
+    EXPECT_EQ("Enabled", readMode(subset, {{"EN", "1"}, {"FAST", "1"}}));
+
+    // A parameter without choices reads as empty and lists none (clearing the list).
+    OrvNebu_ParamChoiceAction none("N", 10002);
+    EXPECT_EQ("", readMode(none, {}));
+    std::vector<std::string> choices{"left", "over"};
+    none.getChoices(nullptr, choices);
+    EXPECT_TRUE(choices.empty());
+}
+
+TEST(ParamChoiceAction, SettingCorners) {
+    OrvNebu_ParamChoiceAction mode = makeMode();
+    Orv_HashMapCStr registers{{"EN", "1"}};
+    // An absent entry counts as empty: nothing is set, the entry is made.
+    Orv_HashMapCStr other{{"X", "On"}};
+    mode.setParams(other, registers);
+    EXPECT_EQ((Orv_HashMapCStr{{"EN", "1"}}), registers);
+    EXPECT_EQ(1u, other.count("MODE"));
+    // Blanks are part of the name.
+    Orv_HashMapCStr params{{"MODE", " On"}};
+    EXPECT_EQ("Setting Parameter 'MODE' to value ' On' is not a valid choice.",
+              logicErrorOf([&] { mode.setParams(params, registers); }));
+    EXPECT_EQ((Orv_HashMapCStr{{"EN", "1"}}), registers);
+}
+
+TEST(ParamChoiceAction, PrintsOneLinePerChoiceWithTheFirstWidth) {
+    OrvNebu_ParamChoiceAction a("P", 10002);
+    a.addChoice("Narrow", 0);
+    a.addChoiceRegSetting(0, 3, "R", "5");
+    a.addChoiceRegSetting(0, 0, "Z", "");
+    a.addChoice("Wide", 1);
+    // The width given first (3) stays; this value is printed cut to 3 bits.
+    a.addChoiceRegSetting(1, 8, "R", "FE");
+    a.addChoice("Empty", 2);
+    std::ostringstream out;
+    a.toCSVFile(out);
+    EXPECT_EQ("P,0,Narrow,R=101,Z=\nP,1,Wide,R=110\nP,2,Empty\n", out.str());
+    EXPECT_EQ(3u, a.getRegWidth("R"));
+}
