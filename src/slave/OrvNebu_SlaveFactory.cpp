@@ -9,28 +9,31 @@
 #include "host/OrvUtil.h"
 #include "slave/OrvNebu_DefaultSlave.h"
 #include "slave/OrvNebu_DirectoryReader.h"
+#include "transceiver/OrvNebu_VanduM3Qrc.h"
+#include "transceiver/OrvNebu_VanduR2Qra.h"
+#include "transceiver/OrvNebu_VanduR3Qra.h"
+#include "transceiver/OrvNebu_VanduR3Qrb.h"
 
 namespace OrvRT {
 
 namespace {
 
-// Sorted by slave type. The transceiver test slave records create default slaves until their
-// classes exist; each names the class it stands for.
+// Sorted by slave type.
 const OrvNebu_SlaveFactory::CreationRecord CREATION_RECORDS[] = {
     {0x00, 0, 0xFFFF, &OrvNebu_DefaultSlave::create},
-    {0x01, 1, 1, &OrvNebu_DefaultSlave::create},  // OrvNebu_VanduM3Qrc
+    {0x01, 1, 1, &OrvNebu_VanduM3Qrc::create},
     {0x11, 1, 0xFFFF, &OrvNebu_DefaultSlave::create},
     {0x12, 1, 0xFFFF, &OrvNebu_DefaultSlave::create},
     {0x13, 1, 0xFFFF, &OrvNebu_DefaultSlave::create},
     {0x14, 1, 0xFFFF, &OrvNebu_DefaultSlave::create},
-    {0x15, 1, 0xFFFF, &OrvNebu_DefaultSlave::create},  // OrvNebu_VanduR3Qra
+    {0x15, 1, 0xFFFF, &OrvNebu_VanduR3Qra::create},
     {0x21, 1, 0xFFFF, &OrvNebu_DefaultSlave::create},
     {0x31, 1, 0xFFFF, &OrvNebu_DefaultSlave::create},
     {0x41, 1, 1, &OrvNebu_DefaultSlave::create},
-    {0x42, 1, 1, &OrvNebu_DefaultSlave::create},  // OrvNebu_VanduR2Qra
-    {0x43, 1, 1, &OrvNebu_DefaultSlave::create},  // OrvNebu_VanduR3Qra
-    {0x44, 1, 1, &OrvNebu_DefaultSlave::create},  // OrvNebu_VanduM3Qrc
-    {0x45, 1, 1, &OrvNebu_DefaultSlave::create},  // OrvNebu_VanduR3Qrb
+    {0x42, 1, 1, &OrvNebu_VanduR2Qra::create},
+    {0x43, 1, 1, &OrvNebu_VanduR3Qra::create},
+    {0x44, 1, 1, &OrvNebu_VanduM3Qrc::create},
+    {0x45, 1, 1, &OrvNebu_VanduR3Qrb::create},
 };
 
 std::string valueOf(const Orv_HashMapCStr& map, const char* key) {

@@ -1,0 +1,21 @@
+// Measured clock frequencies of the clocks of an R3Qra dual, from counter and window registers.
+#pragma once
+
+#include "transceiver/OrvNebu_CounterFreqParamAction.h"
+
+namespace OrvRT {
+
+class OrvNebu_R3Qra_ClockFreqParamAction : public OrvNebu_CounterFreqParamAction {
+public:
+    using Param2Reg = OrvNebu_CounterFreqParamAction::Param2Reg;
+    static const Param2Reg OUT_PARAM_2_REG[];
+    static constexpr uint32_t OUT_PARAM_COUNT = 6;
+
+    OrvNebu_R3Qra_ClockFreqParamAction(OrvNebu_DefaultSlave* slave, uint32_t priority);
+
+protected:
+    std::string frequencyText(const Param2Reg& row, const std::string& sysclkText, uint64_t count,
+                              uint64_t tune) override;
+};
+
+}  // namespace OrvRT
