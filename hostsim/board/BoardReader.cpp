@@ -372,8 +372,8 @@ std::unique_ptr<Board::Impl> readBoard(const std::string& text, const std::strin
     json root;
     try {
         root = json::parse(text);
-    } catch (const json::parse_error& e) {
-        // Drop the library's "[json.exception.parse_error.N] " prefix.
+    } catch (const json::exception& e) {
+        // A number too large for the parser is its out_of_range, not a parse_error. Drop the library's "[json.exception.parse_error.N] " prefix.
         std::string what = e.what();
         const size_t end = what.find("] ");
         if (what.rfind("[json.exception.", 0) == 0 && end != std::string::npos)
