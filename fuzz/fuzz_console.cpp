@@ -56,9 +56,8 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
     try {
         options = nebu::parseOptions(nebu::splitWords(first));
         (void)nebu::usageText();
-    } catch (const nebu::UsageError& e) {
-        NEBU_FUZZ_CHECK(std::string(e.what()).find('\n') == std::string::npos ||
-                        nebu::oneLine(e.what()).find('\n') == std::string::npos);
+    } catch (const nebu::UsageError&) {
+        // The console would print it and stop; the commands still run with the defaults.
     }
 
     OrvSim::resetHost();
