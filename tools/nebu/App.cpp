@@ -71,6 +71,7 @@ int runNebu(int argc, char** argv, std::istream& in, std::ostream& out, std::ost
         OrvSim::setDataDir(options.dataDir.empty() ? share + "data/" : options.dataDir);
 
         Console console(PluginApi::resolve(plugin), out, err, options.session);
+        console.setCable(options.cable);
         console.installSinks(options.trace);
         if (scriptFile.is_open()) console.runStream(scriptFile, false);
         if (scriptFromStdin) console.runStream(in, false);
