@@ -133,7 +133,9 @@ bool OrvNebu_DefaultParamReader::parseLine(ChoiceActions* actions, uint32_t line
         const size_t eq = setting.find('=');
         if (setting.size() < 3 || eq == std::string::npos) return false;
         const std::string bits = setting.substr(eq + 1);
-        if (static_cast<uint64_t>(bits.size()) > UINT32_MAX) return false;
+        // Written so that it holds where size_t is 32 bits too (a comparison with the maximum
+        // would be always false there, and an error under -Werror).
+        if (bits.size() != static_cast<uint32_t>(bits.size())) return false;
         Orv_NumberUtil::binStr2HexStr(bits, value);
         action.addChoiceRegSetting(index, static_cast<uint32_t>(bits.size()), setting.substr(0, eq),
                                    value);
