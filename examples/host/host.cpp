@@ -10,6 +10,18 @@
 #include "hostsim/Sim.h"
 #include "hostsim/board/Board.h"
 
+namespace {
+bool parseIndex(const char* text, uint32_t& value) {
+    const std::string word(text);
+    if (word.empty() || word.size() > 10 || word.find_first_not_of("0123456789") != std::string::npos)
+        return false;
+    const unsigned long long number = std::stoull(word);
+    if (number > 0xFFFFFFFFull) return false;
+    value = static_cast<uint32_t>(number);
+    return true;
+}
+}  // namespace
+
 int main(int argc, char** argv) {
     if (argc < 2 || argc > 5) {
         std::fprintf(stderr, "usage: %s BOARD [DATA_DIR] [DEVICE] [CHAIN]\n", argv[0]);
@@ -25,8 +37,12 @@ int main(int argc, char** argv) {
     OrvSim::setMessageSink([](uint32_t, uint32_t severity, const std::string& text) {
         std::printf("message %u: %s\n", static_cast<unsigned>(severity), text.c_str());
     });
-    const uint32_t device = argc > 3 ? static_cast<uint32_t>(std::stoul(argv[3])) : 0;
-    const uint32_t chain = argc > 4 ? static_cast<uint32_t>(std::stoul(argv[4])) : 1;
+    uint32_t device = 0;
+    uint32_t chain = 1;
+    if ((argc > 3 && !parseIndex(argv[3], device)) || (argc > 4 && !parseIndex(argv[4], chain))) {
+        std::fprintf(stderr, "DEVICE and CHAIN are decimal numbers below 2^32\n");
+        return 2;
+    }
 
     const uint32_t session = 1;
     uint32_t count = 0;

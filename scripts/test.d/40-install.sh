@@ -70,6 +70,16 @@ check_prefix() {  # check_prefix PREFIX: the console and both host builds on the
 }
 
 check_prefix "$work/prefix"
+# The example host refuses what it cannot use, with a message and status 2.
+set +e
+out=$("$work/pc-host" "$work/absent.json" 2>&1); status=$?
+set -e
+expect "example host, missing board: status" 2 "$status"
+grep -q 'absent.json' <<<"$out" || fail "example host, missing board: $out"
+set +e
+out=$("$work/pc-host" "$work/prefix/share/orvnebu/boards/demo.json" "$work/prefix/share/orvnebu/data" 0 x 2>&1); status=$?
+set -e
+expect "example host, bad chain: status" 2 "$status"
 # Nothing refers to the prefix it was installed to.
 mv "$work/prefix" "$work/moved"
 check_prefix "$work/moved"
