@@ -22,4 +22,4 @@ if grep -q 'rc=0x80000000' "$log"; then
 fi
 grep -q 'ERROR SUMMARY: 0 errors' "$dir/valgrind.log" \
   || { cat "$dir/valgrind.log" >&2; echo "30-valgrind: memcheck errors" >&2; exit 1; }
-echo "30-valgrind: $(grep -c '^rc=0x00000000' "$log") calls, $(grep -E 'in use at exit|definitely lost' "$dir/valgrind.log" | sed 's/^==[0-9]*== *//' | tr '\n' ' ')"
+echo "30-valgrind: $(grep -o 'rc=0x00000000' "$log" | wc -l) calls, $(grep -E 'in use at exit|definitely lost' "$dir/valgrind.log" | sed 's/^==[0-9]*== *//' | tr '\n' ' ')"
