@@ -3,7 +3,7 @@
 # the console and every test are built with -m32 (GoogleTest from its sources) and run.
 set -euo pipefail
 root=$(cd "$(dirname "$0")/../.." && pwd)
-"$root/scripts/bootstrap" g++-multilib googletest
+"$root/scripts/bootstrap" g++-multilib googletest file
 dir="$root/build-m32"
 jobs=$(nproc)
 cmake -S "$root" -B "$dir" -DNEBU_WERROR=ON -DNEBU_BUILD_BENCH=OFF -DNEBU_GTEST_FROM_SOURCE=ON \
