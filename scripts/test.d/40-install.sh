@@ -7,8 +7,11 @@
 set -euo pipefail
 root=$(cd "$(dirname "$0")/../.." && pwd)
 build=
+cxxflags=
 if [ "${1:-}" = "--build-dir" ]; then
   build=$2
+  # The outside programs are built the way that build was (-m32 in the 32-bit pass).
+  cxxflags=$(sed -n 's/^CMAKE_CXX_FLAGS:[A-Z]*=//p' "$build/CMakeCache.txt")
   # ctest counts 77 as skipped; the extra pass of scripts/test installs pkg-config.
   command -v pkg-config >/dev/null || { echo "40-install: no pkg-config, skipped"; exit 77; }
 else
@@ -52,7 +55,8 @@ check_prefix() {  # check_prefix PREFIX: the console and both host builds on the
   expect "installed nebu initialize" "rc=0x00000000" "$out"
 
   rm -rf "$work/cmake-host"
-  cmake -S "$root/examples/host" -B "$work/cmake-host" -DCMAKE_PREFIX_PATH="$prefix" >/dev/null
+  cmake -S "$root/examples/host" -B "$work/cmake-host" -DCMAKE_PREFIX_PATH="$prefix" \
+        -DCMAKE_CXX_FLAGS="$cxxflags" >/dev/null
   cmake --build "$work/cmake-host" >/dev/null
   out=$("$work/cmake-host/orvnebu_host" "$prefix/share/orvnebu/boards/demo.json" \
         "$prefix/share/orvnebu/data")
@@ -61,7 +65,7 @@ check_prefix() {  # check_prefix PREFIX: the console and both host builds on the
   local flags
   flags=$(PKG_CONFIG_PATH="$prefix/lib/pkgconfig" pkg-config --cflags --libs orvnebu orvnebu-host)
   # shellcheck disable=SC2086
-  g++ -std=c++17 -o "$work/pc-host" "$root/examples/host/host.cpp" $flags -Wl,-rpath,"$prefix/lib"
+  g++ $cxxflags -std=c++17 -o "$work/pc-host" "$root/examples/host/host.cpp" $flags -Wl,-rpath,"$prefix/lib"
   out=$("$work/pc-host" "$prefix/share/orvnebu/boards/demo.json" "$prefix/share/orvnebu/data" 0 2)
   expect "pkg-config host, transceiver bus" "getSlaveCount rc=0x00000000 count=8" "$out"
   # The demo board's second device has no bus on chain 1.
