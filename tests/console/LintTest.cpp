@@ -347,4 +347,64 @@ TEST_F(LintTest, EachKindOfProblemIsReportedWithItsFileAndLine) {
     }
 }
 
+// The worked example of the reference page, run as the page shows it: its output must stand
+// in the page word for word.
+TEST_F(LintTest, WorkedExampleOfTheReferencePageIsRealOutput) {
+    const fs::path source = fs::path(NEBU_TEST_DATA_DIR).parent_path();
+    const fs::path example = source / "doc" / "example";
+    std::string page = readFile(source / "doc" / "REFERENCE.md");
+    ASSERT_FALSE(page.empty());
+    auto indented = [](const std::string& text) {
+        std::string block;
+        size_t start = 0;
+        while (start < text.size()) {
+            size_t end = text.find('\n', start);
+            if (end == std::string::npos) end = text.size();
+            block += "    " + text.substr(start, end - start) + "\n";
+            start = end + 1;
+        }
+        return block;
+    };
+    // In the page's own relative names: the data directory is "mydata".
+    auto inRoot = [&](const std::string& arguments) {
+        Result r;
+        const std::string command = "cd " + quote(root_.string()) + " && " +
+                                    quote(NEBU_CONSOLE_PATH) + " " + arguments + " 2>&1";
+        FILE* pipe = popen(command.c_str(), "r");
+        if (pipe == nullptr) return r;
+        char buffer[4096];
+        size_t n;
+        while ((n = fread(buffer, 1, sizeof buffer, pipe)) > 0) r.out.append(buffer, n);
+        const int wait = pclose(pipe);
+        r.status = WIFEXITED(wait) ? WEXITSTATUS(wait) : -1;
+        return r;
+    };
+
+    fs::copy(NEBU_TEST_DATA_DIR, root_ / "mydata", fs::copy_options::recursive);
+    data_ = root_ / "mydata";
+    fs::copy(example / "fan_regs.csv", data_);
+    fs::copy(example / "fan_params.csv", data_);
+    append("orvnebu_directory.csv", "0x21,1,0xFFFF,fan_regs.csv,fan_params.csv,fan controller\n");
+
+    Result r = inRoot("--board " + quote((example / "fan_board.json").string()) +
+                      " --data-dir mydata -e 'initialize 0 1 0' -e 'getRegisters 0 1 0'"
+                      " -e 'getParameterChoices 0 1 0 fan_mode'"
+                      " -e 'setParameters 0 1 0 fan_mode=quiet' -e 'getParameters 0 1 0'"
+                      " -e 'peek 0 1 0 0x0000 4' -e 'getRegisters 0 1 0 FAN_TEMP'");
+    EXPECT_EQ(r.status, 1);
+    EXPECT_NE(page.find(indented(r.out + "exit status 1")), std::string::npos) << r.out;
+
+    r = inRoot("lint mydata");
+    EXPECT_EQ(r.status, 0);
+    EXPECT_NE(page.find(indented(r.out + "exit status 0")), std::string::npos) << r.out;
+
+    replace("fan_params.csv", "fan_mode,2,full,FAN_ENABLE=1,FAN_SPEED=1111",
+            "fan_mode,2,full,FAN_ENABEL=1,FAN_SPEED=10000");
+    append("fan_regs.csv", "FAN_BOOST,0,0,7,8,boost,rw,0,y\n");
+    append("orvnebu_directory.csv", "0x21,2,3,fan_regs.csv,,fan controller again\n");
+    r = inRoot("lint mydata");
+    EXPECT_EQ(r.status, 1);
+    EXPECT_NE(page.find(indented(r.out + "exit status 1")), std::string::npos) << r.out;
+}
+
 }  // namespace
