@@ -110,6 +110,10 @@ TEST_F(LintTest, UsageErrors) {
     EXPECT_EQ(r.status, 2);
     EXPECT_EQ(r.err, "nebu: unknown lint option '--strict'\n");
 
+    r = run({"lint", "--help"});
+    EXPECT_EQ(r.status, 0);
+    EXPECT_EQ(r.out.rfind("usage: nebu lint [DATA_DIR]\n", 0), 0u) << r.out;
+
     r = run({"lint", (root_ / "absent").string()});
     EXPECT_EQ(r.status, 2);
     EXPECT_EQ(r.err, "nebu: lint: no data directory '" + (root_ / "absent").string() + "'\n");
@@ -230,6 +234,26 @@ TEST_F(LintTest, EachKindOfProblemIsReportedWithItsFileAndLine) {
              return file("ctrl_params.csv") +
                     ":6: malformed row: a row needs 4 fields and settings of the form "
                     "REGISTER=bits (the plug-in refuses the file)\n";
+         },
+         11},
+        {"register address that is not hexadecimal",
+         [&] { append("counter_regs.csv", "BAD,1g,0,0,3,x,rw,0,y\n"); },
+         [&] {
+             return file("counter_regs.csv") +
+                    ":11: Invalid hexadecimal number \"1g\". (the plug-in refuses the file)\n";
+         },
+         12},
+        {"register line without a name",
+         [&] { append("gpio_regs.csv", ",8,0,0,3,x,rw,0,y\n"); },
+         [&] {
+             return file("gpio_regs.csv") + ":8: slice without a register name: no call can reach it\n";
+         },
+         12},
+        {"setting with digits other than 0 and 1",
+         [&] { replace("ctrl_params.csv", "CTRL_MODE=001", "CTRL_MODE=021"); },
+         [&] {
+             return file("ctrl_params.csv") +
+                    ":4: Invalid binary number \"021\". (the plug-in refuses the file)\n";
          },
          11},
         {"overlapping version ranges",

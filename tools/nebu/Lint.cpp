@@ -6,6 +6,7 @@
 #include <algorithm>
 #include <cctype>
 #include <cstdint>
+#include <filesystem>
 #include <fstream>
 #include <map>
 #include <memory>
@@ -13,7 +14,6 @@
 #include <set>
 #include <stdexcept>
 #include <string>
-#include <sys/stat.h>
 #include <utility>
 #include <vector>
 
@@ -419,8 +419,8 @@ struct DirectoryLine {
 };
 
 bool isDirectory(const std::string& path) {
-    struct stat info;
-    return stat(path.c_str(), &info) == 0 && S_ISDIR(info.st_mode);
+    std::error_code error;
+    return std::filesystem::is_directory(path, error);
 }
 
 bool canOpen(const std::string& path) {
@@ -657,6 +657,14 @@ int runLint(const std::vector<std::string>& args, const std::string& defaultData
     std::string dataDir = defaultDataDir;
     size_t given = 0;
     for (const std::string& arg : args) {
+        if (arg == "--help" || arg == "-h") {
+            out << "usage: nebu lint [DATA_DIR]\n"
+                   "  checks the directory file of DATA_DIR (default: the demo data directory),\n"
+                   "  the register and parameter files it names and what transceiver slaves\n"
+                   "  need; prints FILE:LINE: problem lines and a summary; exit status 0 when\n"
+                   "  clean, 1 with problems, 2 for a usage error\n";
+            return 0;
+        }
         if (arg.size() > 1 && arg[0] == '-') {
             err << "nebu: unknown lint option '" << arg << "'" << std::endl;
             return 2;
