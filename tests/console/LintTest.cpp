@@ -62,7 +62,8 @@ protected:
 
     void replaceAll(const std::string& name, const std::string& from, const std::string& to) {
         std::string text = readFile(data_ / name);
-        for (size_t at = text.find(from); at != std::string::npos; at = text.find(from, at + to.size()))
+        for (size_t at = text.find(from); at != std::string::npos;
+             at = text.find(from, at + to.size()))
             text.replace(at, from.size(), to);
         std::ofstream(data_ / name, std::ios::binary | std::ios::trunc) << text;
     }
@@ -89,9 +90,9 @@ protected:
     std::string summary(size_t lines, size_t files, size_t problems) const {
         return "lint " + data_.string() + "/: " + std::to_string(lines) + " directory lines, " +
                std::to_string(files) + " definition files, " +
-               (problems == 0 ? std::string("no problems")
-                              : std::to_string(problems) +
-                                    (problems == 1 ? " problem" : " problems")) +
+               (problems == 0
+                    ? std::string("no problems")
+                    : std::to_string(problems) + (problems == 1 ? " problem" : " problems")) +
                "\n";
     }
 
@@ -150,8 +151,7 @@ TEST_F(LintTest, ProblemsOfSeveralFilesAreAllReportedInFileAndLineOrder) {
     append("orvnebu_directory.csv", "0x13,0,1,gpio_regs.csv,,again\n");
     Result r = lint();
     EXPECT_EQ(r.status, 1);
-    const std::string tail =
-        ": a register line needs 9 columns (the plug-in refuses the file)\n";
+    const std::string tail = ": a register line needs 9 columns (the plug-in refuses the file)\n";
     EXPECT_EQ(r.out, file("ctrl_regs.csv") +
                          ":19: register WIDE: bits 0 to 16 of word 0x9 lie beyond the 16-bit bus "
                          "word\n" +
@@ -195,8 +195,9 @@ TEST_F(LintTest, EachKindOfProblemIsReportedWithItsFileAndLine) {
         {"register file missing",
          [&] { replace("orvnebu_directory.csv", "gpio_regs.csv", "gpio_registers.csv"); },
          [&] {
-             return dir + ":4: Unable to open OrvNebu register file: " +
-                    file("gpio_registers.csv") + "\n";
+             return dir +
+                    ":4: Unable to open OrvNebu register file: " + file("gpio_registers.csv") +
+                    "\n";
          },
          11},
         {"register file name with a blank after it",
@@ -209,12 +210,11 @@ TEST_F(LintTest, EachKindOfProblemIsReportedWithItsFileAndLine) {
         {"parameter file missing",
          [&] { replace("orvnebu_directory.csv", "ctrl_params.csv", "ctrl_param.csv"); },
          [&] {
-             return dir + ":2: Unable to open OrvNebu parameter file: " +
-                    file("ctrl_param.csv") + "\n";
+             return dir + ":2: Unable to open OrvNebu parameter file: " + file("ctrl_param.csv") +
+                    "\n";
          },
          11},
-        {"register line too short",
-         [&] { append("counter_regs.csv", "EXTRA,5,0,0,3\n"); },
+        {"register line too short", [&] { append("counter_regs.csv", "EXTRA,5,0,0,3\n"); },
          [&] {
              return file("counter_regs.csv") +
                     ":11: line of 5 columns: a register line needs 9 columns (the plug-in "
@@ -243,10 +243,10 @@ TEST_F(LintTest, EachKindOfProblemIsReportedWithItsFileAndLine) {
                     ":11: Invalid hexadecimal number \"1g\". (the plug-in refuses the file)\n";
          },
          12},
-        {"register line without a name",
-         [&] { append("gpio_regs.csv", ",8,0,0,3,x,rw,0,y\n"); },
+        {"register line without a name", [&] { append("gpio_regs.csv", ",8,0,0,3,x,rw,0,y\n"); },
          [&] {
-             return file("gpio_regs.csv") + ":8: slice without a register name: no call can reach it\n";
+             return file("gpio_regs.csv") +
+                    ":8: slice without a register name: no call can reach it\n";
          },
          12},
         {"setting with digits other than 0 and 1",
@@ -263,54 +263,52 @@ TEST_F(LintTest, EachKindOfProblemIsReportedWithItsFileAndLine) {
                     ":11: slave type 0x12: driver versions 3 to 4 are already covered by "
                     "line 3, which wins\n";
          },
-         12,
-         10},
+         12, 10},
         {"empty version range",
          [&] { append("orvnebu_directory.csv", "0x31,5,4,gpio_regs.csv,,reversed\n"); },
-         [&] {
-             return dir + ":11: slave type 0x31: driver versions 5 to 4 is an empty range\n";
-         },
-         12,
-         10},
+         [&] { return dir + ":11: slave type 0x31: driver versions 5 to 4 is an empty range\n"; },
+         12, 10},
         {"directory line without a register file",
          [&] { append("orvnebu_directory.csv", "0x31,1,1,,,nothing\n"); },
          [&] {
-             return dir + ":11: slave type 0x31 has no register file: its slaves cannot be "
-                          "created\n";
+             return dir +
+                    ":11: slave type 0x31 has no register file: its slaves cannot be "
+                    "created\n";
          },
-         12,
-         10},
+         12, 10},
         {"directory line too short to be used",
          [&] { append("orvnebu_directory.csv", "0x31,1\n"); },
-         [&] { return dir + ":11: line of 2 fields is never used: the key columns need 3\n"; },
-         12},
+         [&] { return dir + ":11: line of 2 fields is never used: the key columns need 3\n"; }, 12},
         {"slices of two registers on the same bits",
          [&] { append("ctrl_regs.csv", "CTRL_EXTRA,0,0,3,5,x,rw,0,y\n"); },
          [&] {
              const std::string f = file("ctrl_regs.csv");
-             return f + ":19: register CTRL_EXTRA overlaps register CTRL_MODE (line 3) in bit 3 "
-                        "of word 0x0\n" +
-                    f + ":19: register CTRL_EXTRA overlaps register CTRL_LOOPBACK (line 4) in "
-                        "bit 4 of word 0x0\n";
+             return f +
+                    ":19: register CTRL_EXTRA overlaps register CTRL_MODE (line 3) in bit 3 "
+                    "of word 0x0\n" +
+                    f +
+                    ":19: register CTRL_EXTRA overlaps register CTRL_LOOPBACK (line 4) in "
+                    "bit 4 of word 0x0\n";
          },
          12},
         {"slice beyond the bus word",
          [&] { append("gpio_regs.csv", "WIDE,1f,0,20,12,x,rw,0,y\n"); },
          [&] {
              return file("gpio_regs.csv") +
-                    ":8: register WIDE: bits 12 to 20 of word 0x1f lie beyond the 16-bit bus word\n";
+                    ":8: register WIDE: bits 12 to 20 of word 0x1f lie beyond the 16-bit bus "
+                    "word\n";
          },
          12},
         {"slice beyond the 32-bit word and address beyond the bus",
-         [&] {
-             append("gpio_regs.csv", "HUGE,3,0,40,0,x,rw,0,y\nFAR,20000,0,0,3,x,rw,0,y\n");
-         },
+         [&] { append("gpio_regs.csv", "HUGE,3,0,40,0,x,rw,0,y\nFAR,20000,0,0,3,x,rw,0,y\n"); },
          [&] {
              const std::string f = file("gpio_regs.csv");
-             return f + ":8: Register bit out of range 0 to 31: start bit 40, end bit 0 (the "
-                        "plug-in refuses the file)\n" +
-                    f + ":9: Register address out of range 0 to 1ffff: 20000 (the plug-in "
-                        "refuses the file)\n";
+             return f +
+                    ":8: Register bit out of range 0 to 31: start bit 40, end bit 0 (the "
+                    "plug-in refuses the file)\n" +
+                    f +
+                    ":9: Register address out of range 0 to 1ffff: 20000 (the plug-in "
+                    "refuses the file)\n";
          },
          12},
         {"setting of a register the register file lacks",
@@ -334,16 +332,18 @@ TEST_F(LintTest, EachKindOfProblemIsReportedWithItsFileAndLine) {
              replace("vandu_r3qrb_regs.csv", "RXUSERCLKOUT_FREQ_CNT2,", "RXUSERCLKOUT_FREQ_CNT_2,");
          },
          [&] {
-             return dir + ":10: slave type 0x45 (R3Qrb transceiver) needs register "
-                          "RXUSERCLKOUT_FREQ_CNT2, which " +
+             return dir +
+                    ":10: slave type 0x45 (R3Qrb transceiver) needs register "
+                    "RXUSERCLKOUT_FREQ_CNT2, which " +
                     file("vandu_r3qrb_regs.csv") + " lacks\n";
          },
          12},
         {"transceiver parameter missing",
          [&] { replaceAll("vandu_r2qra_params.csv", "pll_divsel_ref,", "pll_divsel_rf,"); },
          [&] {
-             return dir + ":7: slave type 0x42 (R2Qra transceiver) needs parameter "
-                          "pll_divsel_ref, which " +
+             return dir +
+                    ":7: slave type 0x42 (R2Qra transceiver) needs parameter "
+                    "pll_divsel_ref, which " +
                     file("vandu_r2qra_params.csv") + " lacks\n";
          },
          12},
@@ -353,8 +353,9 @@ TEST_F(LintTest, EachKindOfProblemIsReportedWithItsFileAndLine) {
                      "vandu_r3qrb_regs.csv,");
          },
          [&] {
-             return dir + ":10: slave type 0x45 (R3Qrb transceiver) has no parameter file, so "
-                          "none of its computed parameters\n";
+             return dir +
+                    ":10: slave type 0x45 (R3Qrb transceiver) has no parameter file, so "
+                    "none of its computed parameters\n";
          },
          11},
     };
@@ -363,7 +364,8 @@ TEST_F(LintTest, EachKindOfProblemIsReportedWithItsFileAndLine) {
         copyDemoData();
         c.breakIt();
         const std::string expected = c.expected();
-        const size_t problems = static_cast<size_t>(std::count(expected.begin(), expected.end(), '\n'));
+        const size_t problems =
+            static_cast<size_t>(std::count(expected.begin(), expected.end(), '\n'));
         Result r = lint();
         EXPECT_EQ(r.status, 1);
         EXPECT_EQ(r.out, expected + summary(c.lines, c.files, problems));

@@ -29,9 +29,9 @@ namespace nebu {
 
 namespace {
 
-using OrvRT::OrvNebu_CsvText;
 using OrvRT::Orv_HashMapCStr;
 using OrvRT::Orv_Util;
+using OrvRT::OrvNebu_CsvText;
 using OrvRT::OrvNebu_RegisterHandler;
 
 // The session lint's readers report on; no plug-in session ever has it.
@@ -128,11 +128,12 @@ public:
             const size_t before = slices_.size();
             try {
                 if (!parseLine(lineNumber, line)) {
-                    report.add(regFilename_, lineNumber,
-                               (line.empty() ? std::string("empty line")
-                                             : "line of " + std::to_string(columnCount(line)) +
-                                                   " columns") +
-                                   ": a register line needs 9 columns (the plug-in refuses the file)");
+                    report.add(
+                        regFilename_, lineNumber,
+                        (line.empty()
+                             ? std::string("empty line")
+                             : "line of " + std::to_string(columnCount(line)) + " columns") +
+                            ": a register line needs 9 columns (the plug-in refuses the file)");
                     clean_ = false;
                     continue;
                 }
@@ -165,13 +166,14 @@ public:
             const uint32_t low = std::min(s.startBit, s.endBit);
             const uint32_t high = std::max(s.startBit, s.endBit);
             if (s.registerName.empty()) {
-                report.add(regFilename_, line, "slice without a register name: no call can reach it");
+                report.add(regFilename_, line,
+                           "slice without a register name: no call can reach it");
             }
             if (high >= BUS_WORD_BITS) {
                 report.add(regFilename_, line,
-                           "register " + s.registerName + ": " + bitRange(low, high) +
-                               " of word " + hex(s.address) + " lie beyond the " +
-                               std::to_string(BUS_WORD_BITS) + "-bit bus word");
+                           "register " + s.registerName + ": " + bitRange(low, high) + " of word " +
+                               hex(s.address) + " lie beyond the " + std::to_string(BUS_WORD_BITS) +
+                               "-bit bus word");
             }
             // Parsed slices lie within bits 0 to 31.
             const uint32_t width = high - low + 1;
@@ -191,9 +193,8 @@ public:
                 while (((common >> last) & 1u) == 0) --last;
                 report.add(regFilename_, line,
                            "register " + s.registerName + " overlaps register " +
-                               other.slice->registerName + " (line " +
-                               std::to_string(other.line) + ") in " + bitRange(first, last) +
-                               " of word " + hex(s.address));
+                               other.slice->registerName + " (line " + std::to_string(other.line) +
+                               ") in " + bitRange(first, last) + " of word " + hex(s.address));
             }
             placed.push_back(Placed{line, mask, &s});
         }
@@ -277,8 +278,8 @@ public:
                 const uint32_t line = firstLine + static_cast<uint32_t>(i);
                 for (const auto& setting : choices[i].getRegValueList()) {
                     const auto* reg = registers.findRegister(setting.first);
-                    const std::string where = "parameter " + action->getParamName() +
-                                              ", choice " + choices[i].getChoiceName() + ": ";
+                    const std::string where = "parameter " + action->getParamName() + ", choice " +
+                                              choices[i].getChoiceName() + ": ";
                     if (reg == nullptr) {
                         report.add(path_, line,
                                    where + "register " + setting.first + " is not in " +
@@ -305,8 +306,7 @@ private:
         while (i < hexText.size() && hexText[i] == '0') ++i;
         if (i == hexText.size()) return 0;
         const char c = static_cast<char>(std::toupper(static_cast<unsigned char>(hexText[i])));
-        const uint32_t digit =
-            static_cast<uint32_t>(c >= 'A' ? c - 'A' + 10 : c - '0') & 0xFu;
+        const uint32_t digit = static_cast<uint32_t>(c >= 'A' ? c - 'A' + 10 : c - '0') & 0xFu;
         uint32_t top = 0;
         while ((digit >> top) > 1u) ++top;
         const uint64_t bits = static_cast<uint64_t>(hexText.size() - i - 1) * 4u + top + 1u;
@@ -358,13 +358,12 @@ const TransceiverNeeds& m3QrcNeeds() {
 
 const TransceiverNeeds& r3QraNeeds() {
     static const TransceiverNeeds needs = [] {
-        TransceiverNeeds n{"R3Qra",
-                           counterRegisters({"TXUSRCLK", "TXUSRCLK2", "RXUSRCLK", "RXUSRCLK2",
-                                             "TXOUTCLK", "RXRECCLK"},
-                                            {""}),
-                           {"txpll_divsel_fb", "txpll_divsel45_fb", "txpll_divsel_ref",
-                            "txpll_divsel_out", "rxpll_divsel_fb", "rxpll_divsel_ref",
-                            "rxpll_divsel_out", "tx_data_width"}};
+        TransceiverNeeds n{
+            "R3Qra",
+            counterRegisters(
+                {"TXUSRCLK", "TXUSRCLK2", "RXUSRCLK", "RXUSRCLK2", "TXOUTCLK", "RXRECCLK"}, {""}),
+            {"txpll_divsel_fb", "txpll_divsel45_fb", "txpll_divsel_ref", "txpll_divsel_out",
+             "rxpll_divsel_fb", "rxpll_divsel_ref", "rxpll_divsel_out", "tx_data_width"}};
         n.registers.push_back("MAX_LINERATE");
         n.registers.push_back("TX_OVERSAMPLE_MODE");
         return n;
@@ -405,8 +404,8 @@ struct TransceiverRecord {
     const TransceiverNeeds& (*needs)();
 };
 const TransceiverRecord TRANSCEIVER_RECORDS[] = {
-    {0x01, 1, 1, m3QrcNeeds},     {0x15, 1, 0xFFFF, r3QraNeeds}, {0x42, 1, 1, r2QraNeeds},
-    {0x43, 1, 1, r3QraNeeds},     {0x44, 1, 1, m3QrcNeeds},      {0x45, 1, 1, r3QrbNeeds},
+    {0x01, 1, 1, m3QrcNeeds}, {0x15, 1, 0xFFFF, r3QraNeeds}, {0x42, 1, 1, r2QraNeeds},
+    {0x43, 1, 1, r3QraNeeds}, {0x44, 1, 1, m3QrcNeeds},      {0x45, 1, 1, r3QrbNeeds},
 };
 
 struct DirectoryLine {
@@ -465,8 +464,9 @@ private:
                 log_.messages().empty() ? "cannot be read" : log_.messages().front().second;
             if (text.rfind("Unable to parse header", 0) == 0) {
                 report_.add(directoryFile_, 1,
-                            text + ": the header needs at least 5 columns, among them "
-                                   "slave_type, orv_drv_ver_min and orv_drv_ver_max");
+                            text +
+                                ": the header needs at least 5 columns, among them "
+                                "slave_type, orv_drv_ver_min and orv_drv_ver_max");
             } else {
                 report_.add(directoryFile_, 0, text);
             }
@@ -480,16 +480,20 @@ private:
                        [](unsigned char c) { return static_cast<char>(std::tolower(c)); });
         std::vector<std::string> header;
         OrvNebu_CsvText::splitCommas(line, header);
-        int32_t typeColumn = -1, minColumn = -1, maxColumn = -1, regColumn = -1,
-                paramColumn = -1;
+        int32_t typeColumn = -1, minColumn = -1, maxColumn = -1, regColumn = -1, paramColumn = -1;
         for (size_t i = header.size(); i-- > 0;) {
             const std::string name = Orv_Util::trimWhitespace(header[i]);
             const int32_t column = static_cast<int32_t>(i);
-            if (name == "slave_type") typeColumn = column;
-            else if (name == "orv_drv_ver_min") minColumn = column;
-            else if (name == "orv_drv_ver_max") maxColumn = column;
-            else if (name == "registers") regColumn = column;
-            else if (name == "parameters") paramColumn = column;
+            if (name == "slave_type")
+                typeColumn = column;
+            else if (name == "orv_drv_ver_min")
+                minColumn = column;
+            else if (name == "orv_drv_ver_max")
+                maxColumn = column;
+            else if (name == "registers")
+                regColumn = column;
+            else if (name == "parameters")
+                paramColumn = column;
         }
         const int32_t highest = std::max(typeColumn, std::max(minColumn, maxColumn));
         if (regColumn < 0) {
@@ -613,8 +617,8 @@ private:
                 continue;
             }
             const TransceiverNeeds& needs = record.needs();
-            const std::string what = "slave type " + typeText(d.slaveType) + " (" +
-                                     needs.className + " transceiver)";
+            const std::string what =
+                "slave type " + typeText(d.slaveType) + " (" + needs.className + " transceiver)";
             if (d.parameters.empty()) {
                 report_.add(directoryFile_, d.line,
                             what + " has no parameter file, so none of its computed parameters");
@@ -632,8 +636,8 @@ private:
                 for (const std::string& name : needs.parameters) {
                     if (!params->has(name)) {
                         report_.add(directoryFile_, d.line,
-                                    what + " needs parameter " + name + ", which " +
-                                        dataDir_ + d.parameters + " lacks");
+                                    what + " needs parameter " + name + ", which " + dataDir_ +
+                                        d.parameters + " lacks");
                     }
                 }
             }
