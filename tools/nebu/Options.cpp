@@ -15,7 +15,8 @@ std::string usageText() {
            "  --trace          print every JTAG operation\n"
            "  --plugin PATH    plug-in library to load; default: the one built beside nebu\n"
            "  -e COMMAND       run one command (repeatable); SCRIPT runs first when given\n"
-           "  SCRIPT           file of commands; without -e and SCRIPT, standard input\n";
+           "  SCRIPT           file of commands; without -e and SCRIPT, standard input\n"
+           "       nebu lint [DATA_DIR]   check a data directory (default: the demo data)\n";
 }
 
 Options parseOptions(const std::vector<std::string>& args) {
