@@ -18,7 +18,8 @@ std::string usageText() {
            "  --tck-mhz F      cable test clock in MHz for the stats estimate (default 30)\n"
            "  --round-trip-us R  cost of one cable round trip in microseconds (default 125)\n"
            "  -e COMMAND       run one command (repeatable); SCRIPT runs first when given\n"
-           "  SCRIPT           file of commands; without -e and SCRIPT, standard input\n";
+           "  SCRIPT           file of commands; without -e and SCRIPT, standard input\n"
+           "       nebu lint [DATA_DIR]   check a data directory (default: the demo data)\n";
 }
 
 Options parseOptions(const std::vector<std::string>& args) {
