@@ -107,12 +107,12 @@ void registerAll() {
             ->Unit(benchmark::kMicrosecond);
     };
     add("initialize", [](benchmark::State& s) {
-        runCall(s, [] { return OrvNebu_initialize(H, CTRL); },
-                [] { OrvNebu_terminate(H, CTRL); });
+        runCall(
+            s, [] { return OrvNebu_initialize(H, CTRL); }, [] { OrvNebu_terminate(H, CTRL); });
     });
     add("terminate", [](benchmark::State& s) {
-        runCall(s, [] { return OrvNebu_terminate(H, CTRL); },
-                [] { OrvNebu_initialize(H, CTRL); });
+        runCall(
+            s, [] { return OrvNebu_terminate(H, CTRL); }, [] { OrvNebu_initialize(H, CTRL); });
     });
     add("getBusInfo", [](benchmark::State& s) {
         Map map(Entries{});
@@ -168,21 +168,17 @@ void registerAll() {
     add("clearBusErrorStatus", [](benchmark::State& s) {
         runCall(s, [] { return OrvNebu_clearBusErrorStatus(H, 0, 1); });
     });
-    add("resetBus", [](benchmark::State& s) {
-        runCall(s, [] { return OrvNebu_resetBus(H, 0, 1); });
-    });
+    add("resetBus",
+        [](benchmark::State& s) { runCall(s, [] { return OrvNebu_resetBus(H, 0, 1); }); });
     add("testSlaveInterface", [](benchmark::State& s) {
         runCall(s, [] { return OrvNebu_testSlaveInterface(H, CTRL, &word); });
     });
-    add("resetSlave", [](benchmark::State& s) {
-        runCall(s, [] { return OrvNebu_resetSlave(H, CTRL); });
-    });
-    add("disableSlave", [](benchmark::State& s) {
-        runCall(s, [] { return OrvNebu_disableSlave(H, CTRL); });
-    });
-    add("enableSlave", [](benchmark::State& s) {
-        runCall(s, [] { return OrvNebu_enableSlave(H, CTRL); });
-    });
+    add("resetSlave",
+        [](benchmark::State& s) { runCall(s, [] { return OrvNebu_resetSlave(H, CTRL); }); });
+    add("disableSlave",
+        [](benchmark::State& s) { runCall(s, [] { return OrvNebu_disableSlave(H, CTRL); }); });
+    add("enableSlave",
+        [](benchmark::State& s) { runCall(s, [] { return OrvNebu_enableSlave(H, CTRL); }); });
     add("singleSlaveRead", [](benchmark::State& s) {
         runCall(s, [] { return OrvNebu_singleSlaveRead(H, CTRL, 0x0003, &word, &status); });
     });
@@ -203,8 +199,7 @@ void registerAll() {
         runCall(s, [] { return OrvNebu_burstSlaveRead(H, CTRL, 0x0000, 1, words, 64, &status); });
     });
     add("burstSlaveWrite/64", [](benchmark::State& s) {
-        runCall(s,
-                [] { return OrvNebu_burstSlaveWrite(H, CTRL, 0x0100, 1, words, 64, &status); });
+        runCall(s, [] { return OrvNebu_burstSlaveWrite(H, CTRL, 0x0100, 1, words, 64, &status); });
     });
     add("broadcastSingleWrite", [](benchmark::State& s) {
         runCall(s, [] { return OrvNebu_broadcastSingleWrite(H, 0, 1, 0x0020, 1, &status); });

@@ -1,11 +1,11 @@
 // A tiny host built against an installed OrvNebu: it brings up the stand-in host with a board,
 // asks the plug-in how many slaves a bus has and prints the count.
+#include <orvnebu/orvnebu.h>
+
 #include <cstdint>
 #include <cstdio>
 #include <exception>
 #include <string>
-
-#include <orvnebu/orvnebu.h>
 
 #include "hostsim/Sim.h"
 #include "hostsim/board/Board.h"
@@ -13,7 +13,8 @@
 namespace {
 bool parseIndex(const char* text, uint32_t& value) {
     const std::string word(text);
-    if (word.empty() || word.size() > 10 || word.find_first_not_of("0123456789") != std::string::npos)
+    if (word.empty() || word.size() > 10 ||
+        word.find_first_not_of("0123456789") != std::string::npos)
         return false;
     const unsigned long long number = std::stoull(word);
     if (number > 0xFFFFFFFFull) return false;

@@ -1,10 +1,10 @@
 // The cable-time estimate of the console's stats command.
-#include "CableModel.h"
-
 #include <gtest/gtest.h>
 
 #include <cstdint>
 #include <limits>
+
+#include "CableModel.h"
 
 namespace nebu {
 namespace {

@@ -248,8 +248,8 @@ std::map<std::string, uint64_t> statsFields(const std::string& line) {
 }
 
 TEST_F(NebuProgramTest, StatsEstimatesTheTimeOnACable) {
-    const std::vector<std::string> discovery = {"-e", "getSlaveCount 0 1", "-e", "stats",
-                                                "-e", "stats"};
+    const std::vector<std::string> discovery = {"-e",   "getSlaveCount 0 1", "-e", "stats", "-e",
+                                                "stats"};
     std::vector<std::vector<std::string>> runs = {
         {}, {"--tck-mhz", "1", "--round-trip-us", "0"}, {"--tck-mhz=1e9", "--round-trip-us=1000"}};
     std::vector<std::map<std::string, uint64_t>> seen;
@@ -272,9 +272,9 @@ TEST_F(NebuProgramTest, StatsEstimatesTheTimeOnACable) {
     // At 1 MHz without latency a bit costs a microsecond; at 1 THz only the round trips count.
     EXPECT_EQ(seen[1].at("cableUs"), counts.at("writeBits") + counts.at("readBits"));
     EXPECT_EQ(seen[2].at("cableUs"), counts.at("roundTrips") * 1000u);
-    const double standard = static_cast<double>(counts.at("writeBits") + counts.at("readBits")) /
-                                30.0 +
-                            static_cast<double>(counts.at("roundTrips")) * 125.0;
+    const double standard =
+        static_cast<double>(counts.at("writeBits") + counts.at("readBits")) / 30.0 +
+        static_cast<double>(counts.at("roundTrips")) * 125.0;
     EXPECT_NEAR(static_cast<double>(counts.at("cableUs")), standard, 0.5);
 
     const Result bad = runOnBoard({"--tck-mhz", "0", "-e", "stats"});

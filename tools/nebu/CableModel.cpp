@@ -14,9 +14,9 @@ std::string cableMicroseconds(const OrvSim::JtagStats& stats, const CableModel& 
     // long double keeps 64-bit counters exact; the sum of two of them may pass 2^64.
     const long double bits =
         static_cast<long double>(stats.writeBits) + static_cast<long double>(stats.readBits);
-    const long double us = bits / static_cast<long double>(cable.tckMhz) +
-                           static_cast<long double>(stats.roundTrips) *
-                               static_cast<long double>(cable.roundTripUs);
+    const long double us =
+        bits / static_cast<long double>(cable.tckMhz) +
+        static_cast<long double>(stats.roundTrips) * static_cast<long double>(cable.roundTripUs);
     // %.0Lf rounds halves to even; the estimate rounds them up.
     const long double rounded = std::floor(us + 0.5L);
     const int length = std::snprintf(nullptr, 0, "%.0Lf", rounded);
@@ -44,8 +44,8 @@ double parseCableFigure(const std::string& word, const std::string& option, bool
     const double value = std::strtod(word.c_str(), &end);
     if (end != word.c_str() + word.size() || !std::isfinite(value)) throw UsageError(bad);
     if (value < 0.0 || (value == 0.0 && !zeroAllowed)) {
-        throw UsageError(option + " must be " + (zeroAllowed ? "0 or more" : "above 0") +
-                         ", not " + word);
+        throw UsageError(option + " must be " + (zeroAllowed ? "0 or more" : "above 0") + ", not " +
+                         word);
     }
     return value;
 }
