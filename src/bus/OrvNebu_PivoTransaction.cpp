@@ -148,7 +148,12 @@ void OrvNebu_PivoTransaction::resetHandshake(uint32_t handle, const uint8_t* str
     }
     const uint8_t cleared[CONTROL_BYTES] = {};
     writeResetControl(handle, cleared);
-    if (!done) throw std::logic_error(MSG_TIMED_OUT);
+    if (!done) {
+        // The caller may never touch this bus again: release the reset now rather than leave
+        // the cleared word waiting in the JTAG queue.
+        OrvJtag_target_flush(handle);
+        throw std::logic_error(MSG_TIMED_OUT);
+    }
 }
 
 void OrvNebu_PivoTransaction::testSlaveInterface(uint32_t, ORV_SLAVE_REF, uint32_t* result) {

@@ -41,6 +41,18 @@ uint32_t priorityOf(uint32_t lineNumber) {
     return lineNumber > UINT32_MAX - start ? UINT32_MAX : start + lineNumber;
 }
 
+// Whether a length does not fit the 32-bit register width; only possible where size_t is wider
+// than 32 bits (the host itself is a 32-bit process).
+template <typename Size>
+bool exceedsUint32(Size length) {
+    if constexpr (sizeof(Size) > sizeof(uint32_t)) {
+        return static_cast<uint64_t>(length) > UINT32_MAX;
+    } else {
+        static_cast<void>(length);
+        return false;
+    }
+}
+
 }  // namespace
 
 OrvNebu_DefaultParamReader::SessionEndListener* OrvNebu_DefaultParamReader::sessionListener =
@@ -133,7 +145,7 @@ bool OrvNebu_DefaultParamReader::parseLine(ChoiceActions* actions, uint32_t line
         const size_t eq = setting.find('=');
         if (setting.size() < 3 || eq == std::string::npos) return false;
         const std::string bits = setting.substr(eq + 1);
-        if (static_cast<uint64_t>(bits.size()) > UINT32_MAX) return false;
+        if (exceedsUint32(bits.size())) return false;
         Orv_NumberUtil::binStr2HexStr(bits, value);
         action.addChoiceRegSetting(index, static_cast<uint32_t>(bits.size()), setting.substr(0, eq),
                                    value);

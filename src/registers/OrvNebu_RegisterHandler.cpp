@@ -85,13 +85,18 @@ OrvNebu_RegisterHandler::Register* OrvNebu_RegisterHandler::findRegisterMutable(
 void OrvNebu_RegisterHandler::readRegistersFromFile(uint32_t handle) {
     const std::string fileName = getRegFilename();
     std::ifstream in(fileName, std::ios::in);
-    if (!in.is_open()) {
+    const auto cannotOpen = [&]() {
         std::string text = "Unable to open OrvNebu register file: " + fileName;
         OrvJtag_session_sendMessage(handle, SEVERITY_ERROR, text.c_str());
         throw std::logic_error(text);
-    }
+    };
+    if (!in.is_open()) cannotOpen();
     std::string line;
-    if (!std::getline(in, line)) return;  // an empty file: no header, no registers
+    if (!std::getline(in, line)) {
+        // A path that opens but cannot be read (a directory) must not pass for an empty file.
+        if (in.bad()) cannotOpen();
+        return;  // an empty file: no header, no registers
+    }
     Orv_Util::stripEndingCR(line);
     header_ = line;
     uint32_t lineNumber = 1;
@@ -113,6 +118,8 @@ void OrvNebu_RegisterHandler::readRegistersFromFile(uint32_t handle) {
             throw Orv_AbortException();
         }
     }
+    // A read error part way must not leave a handler that silently lacks registers.
+    if (in.bad()) cannotOpen();
 }
 
 bool OrvNebu_RegisterHandler::parseLine(uint32_t lineNumber, const std::string& line) {

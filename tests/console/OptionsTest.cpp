@@ -17,6 +17,8 @@ TEST(OptionsTest, DefaultsLeaveTheLocationsToTheProgram) {
     EXPECT_FALSE(o.help);
     EXPECT_TRUE(o.commands.empty());
     EXPECT_TRUE(o.script.empty());
+    EXPECT_EQ(o.cable.tckMhz, 30.0);
+    EXPECT_EQ(o.cable.roundTripUs, 125.0);
 }
 
 TEST(OptionsTest, EveryOptionInBothSpellings) {
@@ -53,6 +55,41 @@ TEST(OptionsTest, MistakesAreUsageErrors) {
         FAIL() << "no error";
     } catch (const UsageError& e) {
         EXPECT_STREQ(e.what(), "unknown option '--frobnicate'");
+    }
+}
+
+TEST(OptionsTest, CableFiguresArePlainDecimalNumbers) {
+    Options o = parseOptions({"--tck-mhz", "12.5", "--round-trip-us=0"});
+    EXPECT_EQ(o.cable.tckMhz, 12.5);
+    EXPECT_EQ(o.cable.roundTripUs, 0.0);
+    o = parseOptions({"--tck-mhz=1e1", "--round-trip-us", ".5"});
+    EXPECT_EQ(o.cable.tckMhz, 10.0);
+    EXPECT_EQ(o.cable.roundTripUs, 0.5);
+
+    const std::vector<std::pair<std::vector<std::string>, std::string>> bad = {
+        {{"--tck-mhz", "0"}, "--tck-mhz must be above 0, not 0"},
+        {{"--tck-mhz", "0.0e5"}, "--tck-mhz must be above 0, not 0.0e5"},
+        {{"--tck-mhz", "1e-999"}, "--tck-mhz must be above 0, not 1e-999"},
+        {{"--tck-mhz", "-3"}, "bad number '-3' for --tck-mhz"},
+        {{"--tck-mhz", "1e999"}, "bad number '1e999' for --tck-mhz"},
+        {{"--tck-mhz", "inf"}, "bad number 'inf' for --tck-mhz"},
+        {{"--tck-mhz", "nan"}, "bad number 'nan' for --tck-mhz"},
+        {{"--tck-mhz", "0x10"}, "bad number '0x10' for --tck-mhz"},
+        {{"--tck-mhz", " 30"}, "bad number ' 30' for --tck-mhz"},
+        {{"--tck-mhz", "30MHz"}, "bad number '30MHz' for --tck-mhz"},
+        {{"--tck-mhz="}, "bad number '' for --tck-mhz"},
+        {{"--round-trip-us", "."}, "bad number '.' for --round-trip-us"},
+        {{"--round-trip-us", "1.2.3"}, "bad number '1.2.3' for --round-trip-us"},
+        {{"--round-trip-us", "-0"}, "bad number '-0' for --round-trip-us"},
+        {{"--round-trip-us"}, "option --round-trip-us needs an argument"},
+    };
+    for (const auto& [args, text] : bad) {
+        try {
+            parseOptions(args);
+            ADD_FAILURE() << "no error for " << args.back();
+        } catch (const UsageError& e) {
+            EXPECT_EQ(e.what(), text);
+        }
     }
 }
 

@@ -11,6 +11,7 @@
 #include <vector>
 
 #include "Console.h"
+#include "Lint.h"
 #include "Options.h"
 #include "PluginApi.h"
 #include "SharedLibrary.h"
@@ -46,6 +47,11 @@ int runNebu(int argc, char** argv, std::istream& in, std::ostream& out, std::ost
             bool inIsTerminal) {
     std::vector<std::string> args;
     for (int i = 1; i < argc; ++i) args.emplace_back(argv[i]);
+    if (!args.empty() && args.front() == "lint") {
+        const std::string exeDir = executableDirectory(argc > 0 ? argv[0] : nullptr);
+        return runLint(std::vector<std::string>(args.begin() + 1, args.end()),
+                       exeDir + "/../share/orvnebu/data/", out, err);
+    }
     try {
         const Options options = parseOptions(args);
         if (options.help) {
@@ -71,6 +77,7 @@ int runNebu(int argc, char** argv, std::istream& in, std::ostream& out, std::ost
         OrvSim::setDataDir(options.dataDir.empty() ? share + "data/" : options.dataDir);
 
         Console console(PluginApi::resolve(plugin), out, err, options.session);
+        console.setCable(options.cable);
         console.installSinks(options.trace);
         if (scriptFile.is_open()) console.runStream(scriptFile, false);
         if (scriptFromStdin) console.runStream(in, false);

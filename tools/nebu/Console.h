@@ -9,6 +9,7 @@
 #include <tuple>
 #include <vector>
 
+#include "CableModel.h"
 #include "PluginApi.h"
 #include "host/OrvTypes.h"
 
@@ -28,6 +29,8 @@ public:
     Console(const Console&) = delete;
     Console& operator=(const Console&) = delete;
 
+    // The cable that stats estimates its time on.
+    void setCable(const CableModel& cable) { cable_ = cable; }
     // Prints session messages, and with trace every JTAG operation, on out.
     void installSinks(bool trace);
     // Skips an empty or comment line; otherwise echoes it, runs it and prints its outputs.
@@ -120,6 +123,7 @@ private:
     std::ostream& out_;
     std::ostream& err_;
     uint32_t session_;
+    CableModel cable_;
     bool statusOn_ = true;
     bool failed_ = false;
     bool usageFailed_ = false;

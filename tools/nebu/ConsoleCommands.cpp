@@ -102,10 +102,11 @@ void Console::cmdPoke(const Words& args) {
 void Console::cmdStats(const Words&) {
     useSession();
     const OrvSim::JtagStats s = OrvSim::takeStats(session_);
-    print("stats commands=" + std::to_string(s.commands) +
-          " writeBits=" + std::to_string(s.writeBits) + " readBits=" + std::to_string(s.readBits) +
-          " flushes=" + std::to_string(s.flushes) + " statusReads=" +
-          std::to_string(s.statusReads) + " roundTrips=" + std::to_string(s.roundTrips));
+    print(
+        "stats commands=" + std::to_string(s.commands) +
+        " writeBits=" + std::to_string(s.writeBits) + " readBits=" + std::to_string(s.readBits) +
+        " flushes=" + std::to_string(s.flushes) + " statusReads=" + std::to_string(s.statusReads) +
+        " roundTrips=" + std::to_string(s.roundTrips) + " cableUs=" + cableMicroseconds(s, cable_));
 }
 
 void Console::cmdScan(const Words&) {

@@ -8,14 +8,18 @@ namespace nebu {
 
 std::string usageText() {
     return "usage: nebu [--board FILE] [--data-dir DIR] [--session N] [--trace] [--plugin PATH]"
-           " [-e COMMAND]... [SCRIPT]\n"
+           " [--tck-mhz F]\n"
+           "            [--round-trip-us R] [-e COMMAND]... [SCRIPT]\n"
            "  --board FILE     virtual board (JSON); default: the demo board\n"
            "  --data-dir DIR   host data directory; default: the demo data directory\n"
            "  --session N      session handle of the first command (default 1)\n"
            "  --trace          print every JTAG operation\n"
            "  --plugin PATH    plug-in library to load; default: the one built beside nebu\n"
+           "  --tck-mhz F      cable test clock in MHz for the stats estimate (default 30)\n"
+           "  --round-trip-us R  cost of one cable round trip in microseconds (default 125)\n"
            "  -e COMMAND       run one command (repeatable); SCRIPT runs first when given\n"
-           "  SCRIPT           file of commands; without -e and SCRIPT, standard input\n";
+           "  SCRIPT           file of commands; without -e and SCRIPT, standard input\n"
+           "       nebu lint [DATA_DIR]   check a data directory (default: the demo data)\n";
 }
 
 Options parseOptions(const std::vector<std::string>& args) {
@@ -69,6 +73,10 @@ Options parseOptions(const std::vector<std::string>& args) {
         } else if (arg == "--trace") {
             noValue();
             options.trace = true;
+        } else if (arg == "--tck-mhz") {
+            options.cable.tckMhz = parseCableFigure(value(), arg, false);
+        } else if (arg == "--round-trip-us") {
+            options.cable.roundTripUs = parseCableFigure(value(), arg, true);
         } else if (arg == "-e") {
             options.commands.push_back(value());
         } else if (arg == "--help" || arg == "-h") {

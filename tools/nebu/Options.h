@@ -5,6 +5,8 @@
 #include <string>
 #include <vector>
 
+#include "CableModel.h"
+
 namespace nebu {
 
 struct Options {
@@ -13,6 +15,7 @@ struct Options {
     std::string pluginPath;  // empty: the plug-in built beside the executable
     uint32_t session = 1;
     bool trace = false;
+    CableModel cable;  // --tck-mhz, --round-trip-us
     bool help = false;
     std::vector<std::string> commands;  // the -e commands, in order
     std::string script;                 // empty: none

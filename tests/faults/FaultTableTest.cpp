@@ -1,0 +1,448 @@
+// The failures the plug-in must survive, one row each: what goes wrong on the board or in the
+// data directory, the exported call that meets it, the exact messages with their severities,
+// the return code, and what the board and the caller's data hold afterwards.
+#include <gtest/gtest.h>
+
+#include <filesystem>
+#include <functional>
+#include <string>
+#include <vector>
+
+#include "host/OrvCore.h"
+#include "orvnebu/orvnebu.h"
+#include "slave/OrvNebu_Slave.h"
+#include "slave/OrvNebu_SlaveFactory.h"
+#include "support/TempDataDir.h"
+#include "support/TestHost.h"
+
+namespace {
+
+// Device 0, chain 1: a plain core, then a master with 4 positions: a control block at 0
+// (word 0 = enable 1, mode 1 "run", clock divider 0x12), event counters at 1, 2 and 3 empty.
+// Device 0, chain 2: a transceiver bus: an M3Qrc dual at 0 (data width 20 on channel 0), two
+// R2Qra duals at 1 and 2, the first pointing to the second.
+const char* const BOARD = R"({ "devices": [ { "chains": {
+  "1": { "cores": [ { "type": 3 },
+         { "type": 14, "master": { "slaveCount": 4, "dclkHasReset": true, "slaves": {
+             "0": { "slaveType": "0x11", "driverVersion": 1, "memory": { "0x0000": "0x1203" } },
+             "1": { "slaveType": "0x12", "driverVersion": 1,
+                    "memory": { "0x0000": ["0x0001", "0x0002", "0x0002", "0x00AA"] } } } } } ] },
+  "2": { "cores": [
+         { "type": 14, "master": { "slaveCount": 3, "slaves": {
+             "0": { "slaveType": "0x44", "driverVersion": 1, "memory": { "0x0004": "0x0300" } },
+             "1": { "slaveType": "0x42", "driverVersion": 1, "nextSlave": 1,
+                    "memory": { "0x0002": "0x0005" } },
+             "2": { "slaveType": "0x42", "driverVersion": 1 } } } } ] } } } ] })";
+
+// The same device after a swap: chain 1 holds only plain cores.
+const char* const SWAPPED_BOARD = R"({ "devices": [ { "chains": {
+  "1": { "cores": [ { "type": 3 }, { "type": 3 } ] } } } ] })";
+
+constexpr uint32_t H = TestHost::HANDLE;
+constexpr uint32_t ERR = TestHost::SEVERITY_ERROR;
+constexpr uint32_t LINE = TestHost::SEVERITY_FILE_LINE;
+constexpr uint32_t ABORT = TestHost::SEVERITY_ABORT;
+const char* const ABORT_TEXT = "Orv abort command";
+
+class FaultTableTest;
+
+struct Expected {
+    uint32_t severity;
+    std::string text;  // a "{dir}" in it stands for the data directory
+};
+
+struct Fault {
+    const char* name;
+    std::function<void(FaultTableTest&)> arrange;  // after board and data are in place
+    std::function<uint32_t(FaultTableTest&)> act;  // the exported call that meets the fault
+    uint32_t rc;
+    std::vector<Expected> messages;                    // exactly these, in order
+    std::function<void(FaultTableTest&)> afterwards;  // board, caller's data, recovery
+};
+
+class FaultTableTest : public TestHost, public ::testing::WithParamInterface<Fault> {
+public:
+    using TestHost::board;
+    using TestHost::clearMessages;
+    using TestHost::lastMessageIs;
+    using TestHost::loadBoard;
+    using TestHost::makeMap;
+    using TestHost::mapOf;
+
+    static ORV_SLAVE_REF ref(uint32_t chain, uint32_t slave) { return {0, chain, slave}; }
+
+    // The caller's data: a map, a word buffer and counts, preset so that a write shows.
+    ORV_HASHMAP_HANDLE map = nullptr;
+    uint32_t count = 77;
+    uint32_t words[8] = {0xDEAD, 0xDEAD, 0xDEAD, 0xDEAD, 0xDEAD, 0xDEAD, 0xDEAD, 0xDEAD};
+    uint32_t status = 0xDEAD;
+    std::vector<std::string> choices;
+    TempDataDir data;
+
+    std::string dir() const { return data.dir(); }
+    uint16_t peek(uint32_t chain, uint32_t slave, uint32_t address) {
+        return board()->peek(0, chain, slave, address);
+    }
+    void replaceByDirectory(const std::string& name) {
+        std::filesystem::remove(data.path(name));
+        std::filesystem::create_directory(data.path(name));
+    }
+    void ok(uint32_t rc) { ASSERT_EQ(rc, ORVNEBU_OK) << "arranging the row failed"; }
+    uint32_t initialize(uint32_t chain, uint32_t slave) {
+        return OrvNebu_initialize(H, ref(chain, slave));
+    }
+    bool registered(uint32_t chain, uint32_t slave) {
+        ORV_SLAVE_REF r = ref(chain, slave);
+        OrvRT::Orv_Core* core = OrvRT::Orv_CoreList::getSlave(H, &r);
+        return core != nullptr && core->isOrvNebuSlave();
+    }
+    uint32_t getRegisters(uint32_t chain, uint32_t slave,
+                          std::initializer_list<std::pair<std::string, std::string>> names) {
+        map = makeMap(names);
+        return OrvNebu_getRegisters(H, ref(chain, slave), &map);
+    }
+    uint32_t setParameters(uint32_t chain, uint32_t slave,
+                           std::initializer_list<std::pair<std::string, std::string>> values) {
+        map = makeMap(values);
+        return OrvNebu_setParameters(H, ref(chain, slave), &map);
+    }
+    const OrvRT::Orv_HashMapCStr& caller() { return mapOf(map); }
+
+protected:
+    void SetUp() override {
+        TestHost::SetUp();
+        // A copy of the demo data directory that a row may break.
+        for (const auto& entry : std::filesystem::directory_iterator(NEBU_TEST_DATA_DIR)) {
+            std::filesystem::copy_file(entry.path(), data.path(entry.path().filename().string()));
+        }
+        setDataDir(data.dir());
+        loadBoard(BOARD);
+    }
+};
+
+// The expected text with the data directory filled in.
+std::string expand(const std::string& text, const std::string& dir) {
+    std::string out = text;
+    const std::string key = "{dir}";
+    for (size_t at = out.find(key); at != std::string::npos; at = out.find(key, at + dir.size())) {
+        out.replace(at, key.size(), dir);
+    }
+    return out;
+}
+
+void nothing(FaultTableTest&) {}
+
+std::vector<Fault> faults() {
+    using T = FaultTableTest;
+    const std::string badBus = "Invalid NEBU Bus Device:0, user chain number/bus:1.";
+    return {
+        {"master reset timeout",
+         [](T& t) { t.board()->setResetPolls(0, 1, -1); },
+         [](T& t) { return OrvNebu_getSlaveCount(H, 0, 1, &t.count); },
+         ORVNEBU_FAILED,
+         {{ERR, "NEBU Master timed out.\n"}},
+         [](T& t) {
+             EXPECT_EQ(t.count, 77u);  // no count delivered
+             // The reset control word was zeroed before the failure was reported.
+             std::vector<uint8_t> control = t.board()->lastResetControl(0, 1);
+             ASSERT_FALSE(control.empty());
+             for (uint8_t byte : control) EXPECT_EQ(byte, 0u);
+             // The bus stays known; once the master answers again it works.
+             t.board()->setResetPolls(0, 1, 1);
+             EXPECT_EQ(OrvNebu_resetBus(H, 0, 1), ORVNEBU_OK);
+             EXPECT_EQ(OrvNebu_getSlaveCount(H, 0, 1, &t.count), ORVNEBU_OK);
+             EXPECT_EQ(t.count, 4u);
+         }},
+        {"system clock neither locks nor runs",
+         [](T& t) {
+             t.board()->setClockPolls(0, 1, -1);
+             t.board()->setClockRunning(0, 1, false);
+         },
+         [](T& t) { return OrvNebu_getSlaveCount(H, 0, 1, &t.count); },
+         ORVNEBU_FAILED,
+         {{ERR,
+           "NEBU Master could not reset the System Clock.\nThe System Clock is not locked.\n"
+           "The System Clock is not running.\n"}},
+         [](T& t) {
+             EXPECT_EQ(t.count, 77u);
+             // The bus reset proper never started.
+             EXPECT_TRUE(t.board()->lastResetControl(0, 1).empty());
+             t.board()->setClockPolls(0, 1, 1);
+             EXPECT_EQ(OrvNebu_resetBus(H, 0, 1), ORVNEBU_OK);
+         }},
+        {"system clock running but not locked",
+         [](T& t) { t.board()->setClockPolls(0, 1, -1); },
+         [](T& t) { return OrvNebu_getSlaveCount(H, 0, 1, &t.count); },
+         ORVNEBU_OK,
+         {},
+         [](T& t) { EXPECT_EQ(t.count, 4u); }},
+        {"system clock locked but not running",
+         [](T& t) { t.board()->setClockRunning(0, 1, false); },
+         [](T& t) { return OrvNebu_getSlaveCount(H, 0, 1, &t.count); },
+         ORVNEBU_OK,
+         {},
+         [](T& t) { EXPECT_EQ(t.count, 4u); }},
+        {"bus gone after a board swap",
+         [](T& t) {
+             t.ok(t.initialize(1, 0));
+             t.loadBoard(SWAPPED_BOARD);
+             t.clearMessages();
+             // Rediscovery finds no master: no slaves, and the old bus is forgotten.
+             t.ok(OrvNebu_getSlaveCount(H, 0, 1, &t.count));
+             EXPECT_EQ(t.count, 0u);
+         },
+         [](T& t) { return t.getRegisters(1, 0, {{"CTRL_MODE", "mine"}}); },
+         ORVNEBU_FAILED,
+         {{ERR, badBus}},
+         [=](T& t) {
+             EXPECT_EQ(t.caller(), (OrvRT::Orv_HashMapCStr{{"CTRL_MODE", "mine"}}));
+             EXPECT_TRUE(t.registered(1, 0));  // the slave object waits for its bus
+             EXPECT_EQ(OrvNebu_initialize(H, FaultTableTest::ref(1, 0)), ORVNEBU_FAILED);
+             EXPECT_TRUE(t.lastMessageIs(ERR, badBus));
+             EXPECT_TRUE(t.registered(1, 0));  // a failed initialize removes nothing
+         }},
+        {"core no longer of type 14",
+         [](T& t) {
+             t.ok(OrvNebu_getSlaveCount(H, 0, 1, &t.count));
+             t.loadBoard(SWAPPED_BOARD);
+             t.clearMessages();
+         },
+         [](T& t) {
+             t.map = t.makeMap({{"mine", "kept"}});
+             return OrvNebu_getBusInfo(H, 0, 1, &t.map);
+         },
+         ORVNEBU_FAILED,
+         {{ERR, "Invalid NEBU Bus.\n"}},
+         [](T& t) {
+             EXPECT_EQ(t.caller(), (OrvRT::Orv_HashMapCStr{{"mine", "kept"}}));
+             EXPECT_EQ(OrvNebu_resetBus(H, 0, 1), ORVNEBU_FAILED);
+             EXPECT_TRUE(t.lastMessageIs(ERR, "Invalid NEBU Bus.\n"));
+             EXPECT_EQ(OrvNebu_clearBusErrorStatus(H, 0, 1), ORVNEBU_FAILED);
+             EXPECT_TRUE(t.lastMessageIs(ERR, "Invalid NEBU Bus.\n"));
+         }},
+        {"faulty slave",
+         [](T& t) { t.board()->setSlaveFaulty(0, 1, 1, true); },
+         [](T& t) { return OrvNebu_singleSlaveRead(H, FaultTableTest::ref(1, 1), 3, t.words,
+                                                   &t.status); },
+         ORVNEBU_OK,
+         {},
+         [](T& t) {
+             EXPECT_EQ(t.words[0], 0x00AAu);  // the data still arrives
+             EXPECT_EQ(t.status, 4u);         // with the slave's own error bit
+             EXPECT_TRUE(t.board()->slaveErrorBit(0, 1, 1));
+             EXPECT_EQ(OrvNebu_resetSlave(H, FaultTableTest::ref(1, 1)), ORVNEBU_OK);
+             EXPECT_FALSE(t.board()->slaveErrorBit(0, 1, 1));
+         }},
+        {"empty slave position",
+         nothing,
+         [](T& t) { return t.initialize(1, 2); },
+         ORVNEBU_FAILED,
+         // The identity words read as zeros: slave type 0, which no directory line covers.
+         {{ERR, "No OrvNebu register file specified for OrvNebu slave type: 0, orv driver "
+                "version: 0"}},
+         [](T& t) {
+             EXPECT_FALSE(t.registered(1, 2));
+             EXPECT_EQ(t.board()->busErrorBits(0, 1), 1u);  // the identity read found nobody
+             // A transfer to the empty position reads zeros and reports the bus error.
+             EXPECT_EQ(OrvNebu_singleSlaveRead(H, FaultTableTest::ref(1, 2), 0, t.words,
+                                               &t.status), ORVNEBU_OK);
+             EXPECT_EQ(t.words[0], 0u);
+             EXPECT_EQ(t.status, 1u);
+         }},
+        {"slave index beyond the bus",
+         nothing,
+         [](T& t) { return t.initialize(1, 4); },
+         ORVNEBU_FAILED,
+         {{ERR, "Device:0, user chain number:1, slave index:4, does not have a valid OrvNebu "
+                "slave index.\n"}},
+         [](T& t) { EXPECT_FALSE(t.registered(1, 4)); }},
+        {"directory file missing",
+         [](T& t) { std::filesystem::remove(t.data.path("orvnebu_directory.csv")); },
+         [](T& t) { return t.initialize(1, 0); },
+         ORVNEBU_FAILED,
+         {{ERR, "Unable to open {dir}orvnebu_directory.csv"}, {ABORT, ABORT_TEXT}},
+         [](T& t) { EXPECT_FALSE(t.registered(1, 0)); }},
+        {"directory file unreadable (a directory)",
+         [](T& t) { t.replaceByDirectory("orvnebu_directory.csv"); },
+         [](T& t) { return t.initialize(1, 0); },
+         ORVNEBU_FAILED,
+         {{ERR, "Unable to parse header of CSV file: {dir}orvnebu_directory.csv"},
+          {ABORT, ABORT_TEXT}},
+         [](T& t) { EXPECT_FALSE(t.registered(1, 0)); }},
+        {"directory file malformed header",
+         [](T& t) {
+             t.data.write("orvnebu_directory.csv",
+                          "slave_type,orv_drv_ver_min,registers,parameters,description\n"
+                          "0x11,1,0xFFFF,ctrl_regs.csv,ctrl_params.csv\n");
+         },
+         [](T& t) { return t.initialize(1, 0); },
+         ORVNEBU_FAILED,
+         {{ERR, "Unable to parse header of CSV file: {dir}orvnebu_directory.csv"},
+          {ABORT, ABORT_TEXT}},
+         [](T& t) { EXPECT_FALSE(t.registered(1, 0)); }},
+        {"directory file short line",
+         [](T& t) {
+             t.data.write("orvnebu_directory.csv",
+                          "slave_type,orv_drv_ver_min,orv_drv_ver_max,registers,parameters\n"
+                          "0x11,1\n"
+                          "0x12,1,0xFFFF,counter_regs.csv,\n");
+         },
+         [](T& t) { return t.initialize(1, 0); },
+         ORVNEBU_FAILED,
+         // The short line is passed over, so slave type 0x11 has no entry.
+         {{ERR, "No OrvNebu register file specified for OrvNebu slave type: 17, orv driver "
+                "version: 1"}},
+         [](T& t) {
+             EXPECT_FALSE(t.registered(1, 0));
+             EXPECT_EQ(t.initialize(1, 1), ORVNEBU_OK);  // the lines after it still count
+             EXPECT_TRUE(t.registered(1, 1));
+         }},
+        {"register file missing",
+         [](T& t) { std::filesystem::remove(t.data.path("ctrl_regs.csv")); },
+         [](T& t) { return t.initialize(1, 0); },
+         ORVNEBU_FAILED,
+         {{ERR, "Unable to open OrvNebu register file: {dir}ctrl_regs.csv"}, {ABORT, ABORT_TEXT}},
+         [](T& t) { EXPECT_FALSE(t.registered(1, 0)); }},
+        {"register file unreadable (a directory)",
+         [](T& t) { t.replaceByDirectory("ctrl_regs.csv"); },
+         [](T& t) { return t.initialize(1, 0); },
+         ORVNEBU_FAILED,
+         {{ERR, "Unable to open OrvNebu register file: {dir}ctrl_regs.csv"}, {ABORT, ABORT_TEXT}},
+         [](T& t) { EXPECT_FALSE(t.registered(1, 0)); }},
+        {"register file malformed line",
+         [](T& t) {
+             t.data.write("ctrl_regs.csv",
+                          "name,address,order,start_bit,end_bit,description,access,reset,include\n"
+                          "CTRL_ENABLE,0,0,0,0,global enable,rw,0,y\n"
+                          "CTRL_MODE,0,0,1\r\n");
+         },
+         [](T& t) { return t.initialize(1, 0); },
+         ORVNEBU_FAILED,
+         {{LINE, "Unable to parse file: {dir}ctrl_regs.csv line:3: CTRL_MODE,0,0,1\n"},
+          {ABORT, ABORT_TEXT}},
+         [](T& t) { EXPECT_FALSE(t.registered(1, 0)); }},
+        {"parameter file missing",
+         [](T& t) { std::filesystem::remove(t.data.path("ctrl_params.csv")); },
+         [](T& t) { return t.initialize(1, 0); },
+         ORVNEBU_FAILED,
+         {{ERR, "Unable to open OrvNebu parameter file: {dir}ctrl_params.csv"}, {ABORT, ABORT_TEXT}},
+         [](T& t) { EXPECT_FALSE(t.registered(1, 0)); }},
+        {"parameter file unreadable (a directory)",
+         [](T& t) { t.replaceByDirectory("ctrl_params.csv"); },
+         [](T& t) { return t.initialize(1, 0); },
+         ORVNEBU_FAILED,
+         {{ERR, "Unable to open OrvNebu parameter file: {dir}ctrl_params.csv"},
+          {ABORT, ABORT_TEXT}},
+         [](T& t) { EXPECT_FALSE(t.registered(1, 0)); }},
+        {"parameter file malformed line",
+         [](T& t) {
+             t.data.write("ctrl_params.csv",
+                          "parameter,choice_index,choice,settings\n"
+                          "mode,0,off,CTRL_ENABLE=0\n"
+                          "mode,1,idle,CTRL_ENABLE\n");
+         },
+         [](T& t) { return t.initialize(1, 0); },
+         ORVNEBU_FAILED,
+         {{LINE, "Unable to parse file: {dir}ctrl_params.csv line:3: mode,1,idle,CTRL_ENABLE"},
+          {ABORT, ABORT_TEXT}},
+         [](T& t) { EXPECT_FALSE(t.registered(1, 0)); }},
+        {"register value not hexadecimal",
+         [](T& t) { t.ok(t.initialize(1, 0)); },
+         [](T& t) {
+             t.map = t.makeMap({{"CTRL_ENABLE", "0"}, {"CTRL_CLK_DIV", "G7"}});
+             return OrvNebu_setRegisters(H, FaultTableTest::ref(1, 0), &t.map);
+         },
+         ORVNEBU_FAILED,
+         {{ERR, "Invalid hexadecimal number \"G7\"."}},
+         [](T& t) {
+             EXPECT_EQ(t.peek(1, 0, 0), 0x1203u);  // nothing written, not even CTRL_ENABLE
+             EXPECT_EQ(t.caller(),
+                       (OrvRT::Orv_HashMapCStr{{"CTRL_ENABLE", "0"}, {"CTRL_CLK_DIV", "G7"}}));
+         }},
+        {"parameter value that names no choice",
+         [](T& t) { t.ok(t.initialize(1, 0)); },
+         [](T& t) { return t.setParameters(1, 0, {{"mode", "fast"}}); },
+         ORVNEBU_FAILED,
+         {{ERR, "Setting Parameter 'mode' to value 'fast' is not a valid choice."}},
+         [](T& t) {
+             EXPECT_EQ(t.peek(1, 0, 0), 0x1203u);
+             EXPECT_EQ(t.caller(), (OrvRT::Orv_HashMapCStr{{"mode", "fast"}}));
+         }},
+        {"line rate string that cannot be read",
+         [](T& t) { t.ok(t.initialize(2, 0)); },
+         [](T& t) {
+             return t.setParameters(2, 0, {{"line_rate0", "fast FB=2, REF=1, DIVSEL=1"},
+                                           {"sysclk_freq", "50"}});
+         },
+         ORVNEBU_FAILED,
+         {{ERR, "Unable to set line rate from string 'fast FB=2, REF=1, DIVSEL=1'"}},
+         [](T& t) {
+             for (uint32_t address = 0; address < 0x40; ++address) {
+                 EXPECT_EQ(t.peek(2, 0, address), address == 4 ? 0x0300u : 0u) << address;
+             }
+         }},
+        {"slave chain that loops",
+         [](T& t) {
+             t.ok(t.initialize(2, 1));
+             t.ok(t.initialize(2, 2));
+             // Board words cannot point backwards; a host that registers slave objects of its
+             // own can. Slave 2 now points back to slave 1.
+             ORV_SLAVE_REF r = FaultTableTest::ref(2, 2);
+             OrvRT::Orv_Core* old = OrvRT::Orv_CoreList::getSlave(H, &r);
+             OrvRT::Orv_CoreList::removeCore(H, &old);
+             OrvRT::Orv_HashMapCStr info{{"slave_type", "66"}, {"orv_drv_ver", "1"},
+                                         {"next_slave", "-1"}};
+             OrvRT::OrvNebu_Slave* looping = OrvRT::OrvNebu_SlaveFactory::create(H, r, info);
+             ASSERT_NE(looping, nullptr);
+             OrvRT::Orv_CoreList::addCore(H, looping);
+         },
+         [](T& t) { return t.getRegisters(2, 1, {}); },
+         ORVNEBU_OK,
+         {},
+         [](T& t) {
+             // Slave 1 takes its clock from the south line (REFCLKSEL 5); nobody on the loop
+             // drives it, so the question comes back round and ends as unknown.
+             t.map = t.makeMap({{"refclk_source", ""}});
+             EXPECT_EQ(OrvNebu_getParameters(H, FaultTableTest::ref(2, 1), &t.map), ORVNEBU_OK);
+             EXPECT_EQ(t.caller(),
+                       (OrvRT::Orv_HashMapCStr{{"refclk_source", "Unknown ref clock source"}}));
+             t.map = t.makeMap({{"internal_param_NORTH_DRIVER", ""}});
+             EXPECT_EQ(OrvNebu_getParameters(H, FaultTableTest::ref(2, 2), &t.map), ORVNEBU_OK);
+             EXPECT_EQ(t.caller(), (OrvRT::Orv_HashMapCStr{
+                                       {"internal_param_NORTH_DRIVER", "Unknown ref clock source"}}));
+         }},
+    };
+}
+
+TEST_P(FaultTableTest, SurvivesWithExactReport) {
+    const Fault& fault = GetParam();
+    fault.arrange(*this);
+    if (HasFatalFailure()) return;
+    clearMessages();
+    EXPECT_EQ(fault.act(*this), fault.rc);
+    std::vector<Message> got = messages();
+    std::vector<std::pair<uint32_t, std::string>> actual, expected;
+    for (const Message& m : got) actual.emplace_back(m.severity, m.text);
+    for (const Expected& e : fault.messages) expected.emplace_back(e.severity, expand(e.text, dir()));
+    EXPECT_EQ(actual, expected);
+    fault.afterwards(*this);
+}
+
+std::string rowName(const ::testing::TestParamInfo<Fault>& info) {
+    std::string name;
+    for (const char* c = info.param.name; *c != '\0'; ++c) {
+        const bool alnum = (*c >= 'a' && *c <= 'z') || (*c >= 'A' && *c <= 'Z') ||
+                           (*c >= '0' && *c <= '9');
+        if (alnum) {
+            name += *c;
+        } else if (!name.empty() && name.back() != '_') {
+            name += '_';
+        }
+    }
+    while (!name.empty() && name.back() == '_') name.pop_back();
+    return name;
+}
+
+INSTANTIATE_TEST_SUITE_P(Rows, FaultTableTest, ::testing::ValuesIn(faults()), rowName);
+
+}  // namespace
