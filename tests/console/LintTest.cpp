@@ -11,26 +11,15 @@
 #include <string>
 #include <vector>
 
+#include "support/NebuRun.h"
+
 namespace {
 
 namespace fs = std::filesystem;
 
-struct Result {
-    int status = -1;
-    std::string out;
-    std::string err;
-};
-
-std::string quote(const std::string& text) {
-    std::string q = "'";
-    for (char c : text) q += c == '\'' ? std::string("'\\''") : std::string(1, c);
-    return q + "'";
-}
-
-std::string readFile(const fs::path& path) {
-    std::ifstream in(path, std::ios::binary);
-    return std::string(std::istreambuf_iterator<char>(in), std::istreambuf_iterator<char>());
-}
+using nebutest::quote;
+using nebutest::readFile;
+using nebutest::Result;
 
 class LintTest : public ::testing::Test {
 protected:
@@ -69,20 +58,7 @@ protected:
     }
 
     Result run(const std::vector<std::string>& args) {
-        const fs::path err = root_ / "stderr.txt";
-        std::string command = quote(NEBU_CONSOLE_PATH);
-        for (const auto& arg : args) command += " " + quote(arg);
-        command += " </dev/null 2>" + quote(err.string());
-        Result result;
-        FILE* pipe = popen(command.c_str(), "r");
-        if (pipe == nullptr) return result;
-        char buffer[4096];
-        size_t n;
-        while ((n = fread(buffer, 1, sizeof buffer, pipe)) > 0) result.out.append(buffer, n);
-        const int wait = pclose(pipe);
-        result.status = WIFEXITED(wait) ? WEXITSTATUS(wait) : -1;
-        result.err = readFile(err);
-        return result;
+        return nebutest::runNebu(args, "/dev/null", root_ / "stderr.txt");
     }
     Result lint() { return run({"lint", data_.string()}); }
 

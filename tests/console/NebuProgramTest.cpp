@@ -16,26 +16,15 @@
 #include <string>
 #include <vector>
 
+#include "support/NebuRun.h"
+
 namespace {
 
 namespace fs = std::filesystem;
 
-struct Result {
-    int status = -1;
-    std::string out;
-    std::string err;
-};
-
-std::string quote(const std::string& text) {
-    std::string q = "'";
-    for (char c : text) q += c == '\'' ? std::string("'\\''") : std::string(1, c);
-    return q + "'";
-}
-
-std::string readFile(const fs::path& path) {
-    std::ifstream in(path, std::ios::binary);
-    return std::string(std::istreambuf_iterator<char>(in), std::istreambuf_iterator<char>());
-}
+using nebutest::quote;
+using nebutest::readFile;
+using nebutest::Result;
 
 // Lines of text, without their line feeds.
 std::vector<std::string> lines(const std::string& text) {
@@ -78,21 +67,7 @@ protected:
 
     // Runs nebu with the arguments, standard input from a file (never a terminal).
     Result run(const std::vector<std::string>& args, const std::string& input = "") {
-        const std::string in = write("stdin.txt", input);
-        const fs::path err = dir_ / "stderr.txt";
-        std::string command = quote(NEBU_CONSOLE_PATH);
-        for (const auto& arg : args) command += " " + quote(arg);
-        command += " <" + quote(in) + " 2>" + quote(err.string());
-        Result result;
-        FILE* pipe = popen(command.c_str(), "r");
-        if (pipe == nullptr) return result;
-        char buffer[4096];
-        size_t n;
-        while ((n = fread(buffer, 1, sizeof buffer, pipe)) > 0) result.out.append(buffer, n);
-        const int wait = pclose(pipe);
-        result.status = WIFEXITED(wait) ? WEXITSTATUS(wait) : -1;
-        result.err = readFile(err);
-        return result;
+        return nebutest::runNebu(args, write("stdin.txt", input), dir_ / "stderr.txt");
     }
     // With the test board and the plug-in under test.
     Result runOnBoard(std::vector<std::string> args, const std::string& input = "") {
