@@ -6,6 +6,7 @@
 #include <cstdio>
 #include <cstdlib>
 #include <fstream>
+#include <map>
 #include <memory>
 #include <ostream>
 #include <sstream>
@@ -93,13 +94,24 @@ inline std::string demoFile(const std::string& name) { return demoDataDir() + na
         }                                                                             \
     } while (0)
 
+// The board of a board file text as loaded, without parsing the text on every run: a copy of
+// the board loaded the first time.
+inline std::shared_ptr<OrvSim::Board> freshBoard(const std::string& boardJson) {
+    static std::map<std::string, std::shared_ptr<const OrvSim::Board>> loaded;
+    auto it = loaded.find(boardJson);
+    if (it == loaded.end()) {
+        it = loaded.emplace(boardJson, OrvSim::Board::loadText(boardJson, "fuzz board")).first;
+    }
+    return it->second->copy();
+}
+
 // One run against a fresh stand-in host: the board, the data directory, and the promise every
 // exported call keeps: it returns OK or FAILED, and a failure has been reported on the session
 // channel.
 class HostRun {
 public:
     HostRun(const std::string& boardJson, const std::string& dataDir)
-        : HostRun(OrvSim::Board::loadText(boardJson, "fuzz board"), dataDir) {}
+        : HostRun(freshBoard(boardJson), dataDir) {}
     HostRun(std::shared_ptr<OrvSim::Board> board, const std::string& dataDir) {
         OrvSim::resetHost();
         OrvSim::setMessageSink(

@@ -46,7 +46,8 @@ void checkFailuresReported(const std::string& output) {
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
     using namespace nebufuzz;
-    static const std::string boardText = readText(std::string(NEBU_FUZZ_DATA_DIR) + "/../boards/demo.json");
+    static const std::string boardText =
+        readText(std::string(NEBU_FUZZ_DATA_DIR) + "/../boards/demo.json");
     static const nebu::PluginApi api = linkedApi();
 
     std::istringstream input(std::string(reinterpret_cast<const char*>(data), size));
@@ -61,7 +62,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
     }
 
     OrvSim::resetHost();
-    OrvSim::setBoard(OrvSim::Board::loadText(boardText, "demo board"));
+    OrvSim::setBoard(freshBoard(boardText));
     OrvSim::setDataDir(demoDataDir());
     std::ostringstream out;
     {

@@ -67,6 +67,28 @@ std::shared_ptr<Board> Board::loadText(const std::string& json, const std::strin
     return std::shared_ptr<Board>(new Board(readBoard(json, name)));
 }
 
+std::shared_ptr<Board> Board::copy() const {
+    auto impl = std::make_unique<Impl>();
+    std::lock_guard<std::mutex> lock(impl_->mutex);
+    impl->devices.reserve(impl_->devices.size());
+    for (const BoardDevice& device : impl_->devices) {
+        BoardDevice& to = impl->devices.emplace_back();
+        to.trellom = device.trellom;
+        for (const auto& [number, chain] : device.chains) {
+            BoardChain& toChain = to.chains[number];
+            toChain.cores.reserve(chain.cores.size());
+            for (const BoardCore& core : chain.cores) {
+                BoardCore& toCore = toChain.cores.emplace_back();
+                toCore.type = core.type;
+                toCore.hasRawStatus = core.hasRawStatus;
+                toCore.rawStatus = core.rawStatus;
+                if (core.master) toCore.master = std::make_unique<BusMaster>(*core.master);
+            }
+        }
+    }
+    return std::shared_ptr<Board>(new Board(std::move(impl)));
+}
+
 std::shared_ptr<Board> Board::loadFile(const std::string& path) {
     std::FILE* file = std::fopen(path.c_str(), "rb");
     if (file == nullptr) {

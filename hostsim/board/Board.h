@@ -30,6 +30,10 @@ public:
     // name: used in error messages in place of a file name.
     static std::shared_ptr<Board> loadText(const std::string& json, const std::string& name);
 
+    // An independent board in this one's present state: runs that each need a fresh board
+    // copy one instead of reading the file again.
+    std::shared_ptr<Board> copy() const;
+
     virtual ~Board();
 
     uint32_t deviceCount() const;

@@ -85,6 +85,26 @@ BusMaster::BusMaster(const MasterConfig& config, std::vector<std::unique_ptr<Boa
     slaveErrors_.assign(config_.slaveCount, 0);
 }
 
+BusMaster::BusMaster(const BusMaster& other)
+    : config_(other.config_),
+      slaveErrors_(other.slaveErrors_),
+      busErrors_(other.busErrors_),
+      resetWord_(other.resetWord_),
+      resetStrobe_(other.resetStrobe_),
+      resetState_(other.resetState_),
+      resetTargets_(other.resetTargets_),
+      resetReads_(other.resetReads_),
+      clockResetBit_(other.clockResetBit_),
+      clockState_(other.clockState_),
+      clockReads_(other.clockReads_),
+      transferControl_(other.transferControl_),
+      addressWord_(other.addressWord_) {
+    slaves_.reserve(other.slaves_.size());
+    for (const auto& slave : other.slaves_) {
+        slaves_.push_back(slave ? std::make_unique<BoardSlave>(*slave) : nullptr);
+    }
+}
+
 void BusMaster::write(uint32_t cmd, const uint8_t* data, uint32_t bitCount) {
     switch (cmd) {
         case CMD_RESET_CONTROL:

@@ -49,6 +49,9 @@ public:
 
     // slaves: one entry per position (slaveCount entries); null for an empty position.
     BusMaster(const MasterConfig& config, std::vector<std::unique_ptr<BoardSlave>> slaves);
+    // A master in the same state, with slaves of its own.
+    BusMaster(const BusMaster& other);
+    BusMaster& operator=(const BusMaster&) = delete;
 
     // One command; data holds bitCount bits, least significant first.
     void write(uint32_t cmd, const uint8_t* data, uint32_t bitCount);
