@@ -358,7 +358,7 @@ private:
                 if (!given.insert(address).second) {
                     fail(entryPath, "address " + hexText(address) + " is given twice");
                 }
-                if (words[i] != 0) slave.memory[address] = words[i];
+                slave.memory.set(address, words[i]);
             }
         }
     }

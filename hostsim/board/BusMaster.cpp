@@ -291,17 +291,31 @@ uint16_t BusMaster::fetch(const BoardSlave& slave, uint32_t address) {
     if (address >= IDENT_FIRST && address < IDENT_FIRST + IDENT_COUNT) {
         return slave.ident[address - IDENT_FIRST];
     }
-    auto it = slave.memory.find(address);
-    return it == slave.memory.end() ? uint16_t(0) : it->second;
+    return slave.memory.get(address);
 }
 
 void BusMaster::store(BoardSlave& slave, uint32_t address, uint16_t value) {
     if (address >= IDENT_FIRST && address < IDENT_FIRST + IDENT_COUNT) return;
-    if (value == 0) {
-        slave.memory.erase(address);
-    } else {
-        slave.memory[address] = value;
+    slave.memory.set(address, value);
+}
+
+SlaveMemory& SlaveMemory::operator=(const SlaveMemory& other) {
+    if (this == &other) return *this;
+    for (size_t i = 0; i < pages_.size(); ++i) {
+        pages_[i] = other.pages_[i] ? std::make_unique<Page>(*other.pages_[i]) : nullptr;
     }
+    return *this;
+}
+
+void SlaveMemory::set(uint32_t address, uint16_t value) {
+    address &= ADDRESS_MASK;
+    std::unique_ptr<Page>& page = pages_[address >> PAGE_BITS];
+    if (!page) {
+        if (value == 0) return;
+        page = std::make_unique<Page>();
+        page->fill(0);
+    }
+    (*page)[address & PAGE_MASK] = value;
 }
 
 // --- direct access --------------------------------------------------------------------------

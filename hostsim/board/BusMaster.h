@@ -4,10 +4,36 @@
 
 #include <cstdint>
 #include <memory>
-#include <unordered_map>
+#include <array>
 #include <vector>
 
 namespace OrvSim {
+
+// A slave's 0x20000 words. Pages are made on the first non-zero write, so a board copies fast
+// and a burst over the whole space does not go through a hash per word.
+class SlaveMemory {
+public:
+    SlaveMemory() = default;
+    SlaveMemory(const SlaveMemory& other) { *this = other; }
+    SlaveMemory& operator=(const SlaveMemory& other);
+    SlaveMemory(SlaveMemory&&) = default;
+    SlaveMemory& operator=(SlaveMemory&&) = default;
+
+    // Addresses wrap at 0x20000, as on the bus. A word never written reads 0.
+    uint16_t get(uint32_t address) const {
+        address &= ADDRESS_MASK;
+        const Page* page = pages_[address >> PAGE_BITS].get();
+        return page ? (*page)[address & PAGE_MASK] : uint16_t(0);
+    }
+    void set(uint32_t address, uint16_t value);
+
+private:
+    static constexpr uint32_t ADDRESS_MASK = 0x1FFFF;
+    static constexpr uint32_t PAGE_BITS = 12;
+    static constexpr uint32_t PAGE_MASK = (1u << PAGE_BITS) - 1;
+    using Page = std::array<uint16_t, size_t(1) << PAGE_BITS>;
+    std::array<std::unique_ptr<Page>, (ADDRESS_MASK >> PAGE_BITS) + 1> pages_;
+};
 
 // One slave position that holds a slave.
 struct BoardSlave {
@@ -15,8 +41,7 @@ struct BoardSlave {
     // edaVersion, word6, nextSlave.
     uint16_t ident[8] = {};
     bool faulty = false;
-    // Absent addresses read 0.
-    std::unordered_map<uint32_t, uint16_t> memory;
+    SlaveMemory memory;
 };
 
 // What the board file says about a master.

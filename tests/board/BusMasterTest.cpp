@@ -69,6 +69,13 @@ TEST_F(BusMasterTest, BurstsWithAndWithoutIncrementAndAddressWrap) {
     EXPECT_EQ(board->peek(DEV, CHAIN, 1, 0x00001), 0xE3);
     EXPECT_EQ(burstRead(1, 0x1FFFF, true, 2), (std::vector<uint16_t>{0xE1, 0xE2}));
 
+    // Across the board's 4096-word storage pages; a zero overwrites like any value.
+    burstWrite(1, 0xFFE, true, {0x0A, 0x0B, 0x0C, 0x0D});
+    burstWrite(1, 0xFFF, true, {0x0000});
+    EXPECT_EQ(burstRead(1, 0xFFD, true, 6),
+              (std::vector<uint16_t>{0, 0x0A, 0, 0x0C, 0x0D, 0}));
+    EXPECT_EQ(burstRead(0, 0xFFE, true, 4), (std::vector<uint16_t>{0, 0, 0, 0}));
+
     // An empty burst moves nothing and is no error.
     burstWrite(0, 0x100, true, {});
     EXPECT_EQ(burstRead(0, 0x100, true, 0), std::vector<uint16_t>{});
