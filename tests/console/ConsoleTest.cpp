@@ -372,6 +372,21 @@ TEST_F(ConsoleTest, UsageErrorsAreReportedAndTheConsoleGoesOn) {
     EXPECT_EQ(status(), 2);
 }
 
+TEST_F(ConsoleTest, ALowerWordBoundAppliesToCountsAndValueLists) {
+    console_->setMaxCommandWords(2);
+    run({"getSlaveHandles 0 1 2", "getSlaveHandles 0 1 3", "burstSlaveWrite 0 1 0 0 1 5 6 7",
+         "burstSlaveWrite 0 1 0 0 1 5 6"});
+    EXPECT_EQ(err(),
+              "nebu: COUNT 3 is more than the console allows (2)\n"
+              "nebu: more than 2 words\n");
+    EXPECT_EQ(g_calls, (std::vector<std::string>{"h1 getSlaveHandles 0,1 set 2",
+                                                 "h1 burstSlaveWrite 0,1,0 0 1 set 2 5 6"}));
+    // It can only lower the bound.
+    console_->setMaxCommandWords(0xFFFFFFFFu);
+    run({"getSlaveHandles 0 1 0x20001"});
+    EXPECT_EQ(err(), "nebu: COUNT 0x20001 is more than the console allows (131072)\n");
+}
+
 TEST_F(ConsoleTest, DumpInitializesOnlyWhatThisConsoleHasNotInitialized) {
     EXPECT_EQ(run({"dump 0 1 0 refclk_freq=125"}),
               "> dump 0 1 0 refclk_freq=125\n"

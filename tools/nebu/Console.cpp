@@ -150,13 +150,19 @@ uint32_t Console::number(const Words& args, size_t i, const char* what) {
     return parseNumber(args[i], what);
 }
 
-uint32_t Console::count(const Words& args, size_t i, const char* what) {
+uint32_t Console::count(const Words& args, size_t i, const char* what) const {
     const uint32_t n = parseNumber(args[i], what);
-    if (n > MAX_COMMAND_WORDS) {
+    if (n > maxWords_) {
         throw UsageError(std::string(what) + " " + args[i] + " is more than the console allows (" +
-                         std::to_string(MAX_COMMAND_WORDS) + ")");
+                         std::to_string(maxWords_) + ")");
     }
     return n;
+}
+
+void Console::checkValueCount(const Words& args, size_t fixed) const {
+    if (args.size() - fixed > maxWords_) {
+        throw UsageError("more than " + std::to_string(maxWords_) + " words");
+    }
 }
 
 ORV_SLAVE_REF Console::slaveRef(const Words& args, size_t first) {

@@ -2,6 +2,7 @@
 // runs its own commands, and prints echo, messages, return codes and outputs.
 #pragma once
 
+#include <algorithm>
 #include <cstdint>
 #include <iosfwd>
 #include <set>
@@ -31,6 +32,8 @@ public:
 
     // The cable that stats estimates its time on.
     void setCable(const CableModel& cable) { cable_ = cable; }
+    // A lower bound than MAX_COMMAND_WORDS, for runs that must stay quick.
+    void setMaxCommandWords(uint32_t words) { maxWords_ = std::min(words, MAX_COMMAND_WORDS); }
     // Prints session messages, and with trace every JTAG operation, on out.
     void installSinks(bool trace);
     // Skips an empty or comment line; otherwise echoes it, runs it and prints its outputs.
@@ -69,7 +72,9 @@ private:
     uint32_t* statusPointer(uint32_t& status) { return statusOn_ ? &status : nullptr; }
 
     static uint32_t number(const Words& args, size_t i, const char* what);
-    static uint32_t count(const Words& args, size_t i, const char* what);
+    uint32_t count(const Words& args, size_t i, const char* what) const;
+    // Refuses more than maxWords_ values after the first `fixed` words.
+    void checkValueCount(const Words& args, size_t fixed) const;
     static ORV_SLAVE_REF slaveRef(const Words& args, size_t first);
     using RefKey = std::tuple<uint32_t, uint32_t, uint32_t, uint32_t>;
     RefKey key(const ORV_SLAVE_REF& ref) const {
@@ -124,6 +129,7 @@ private:
     std::ostream& err_;
     uint32_t session_;
     CableModel cable_;
+    uint32_t maxWords_ = MAX_COMMAND_WORDS;
     bool statusOn_ = true;
     bool failed_ = false;
     bool usageFailed_ = false;

@@ -78,9 +78,7 @@ void Console::cmdPeek(const Words& args) {
 void Console::cmdPoke(const Words& args) {
     const ORV_SLAVE_REF ref = slaveRef(args, 0);
     const uint32_t address = busAddress(args[3]);
-    if (args.size() - 4 > MAX_COMMAND_WORDS) {
-        throw UsageError("more than " + std::to_string(MAX_COMMAND_WORDS) + " words");
-    }
+    checkValueCount(args, 4);
     // Every value is checked before the first is written, so a typo writes nothing.
     std::vector<uint16_t> values;
     for (size_t i = 4; i < args.size(); ++i) {

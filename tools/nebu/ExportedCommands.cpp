@@ -248,9 +248,7 @@ void Console::cmdBurstSlaveWrite(const Words& args) {
     const ORV_SLAVE_REF ref = slaveRef(args, 0);
     const uint32_t address = number(args, 3, "ADDRESS");
     const uint32_t incr = number(args, 4, "INCR");
-    if (args.size() - 5 > MAX_COMMAND_WORDS) {
-        throw UsageError("more than " + std::to_string(MAX_COMMAND_WORDS) + " words");
-    }
+    checkValueCount(args, 5);
     std::vector<uint32_t> values;
     for (size_t i = 5; i < args.size(); ++i) values.push_back(number(args, i, "VALUE"));
     const auto n = static_cast<uint32_t>(values.size());
