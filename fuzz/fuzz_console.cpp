@@ -67,6 +67,8 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
     std::ostringstream out;
     {
         nebu::Console console(api, out, nullStream(), options.session);
+        // Lists of 0x20000 words take milliseconds to print and reach nothing that 256 do not.
+        console.setMaxCommandWords(0x100);
         console.installSinks(options.trace);
         std::string line;
         for (int n = 0; n < 16 && !console.quitRequested() && std::getline(input, line); ++n) {

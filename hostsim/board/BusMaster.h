@@ -29,7 +29,7 @@ public:
 
 private:
     static constexpr uint32_t ADDRESS_MASK = 0x1FFFF;
-    static constexpr uint32_t PAGE_BITS = 12;
+    static constexpr uint32_t PAGE_BITS = 10;
     static constexpr uint32_t PAGE_MASK = (1u << PAGE_BITS) - 1;
     using Page = std::array<uint16_t, size_t(1) << PAGE_BITS>;
     std::array<std::unique_ptr<Page>, (ADDRESS_MASK >> PAGE_BITS) + 1> pages_;

@@ -69,7 +69,7 @@ TEST_F(BusMasterTest, BurstsWithAndWithoutIncrementAndAddressWrap) {
     EXPECT_EQ(board->peek(DEV, CHAIN, 1, 0x00001), 0xE3);
     EXPECT_EQ(burstRead(1, 0x1FFFF, true, 2), (std::vector<uint16_t>{0xE1, 0xE2}));
 
-    // Across the board's 4096-word storage pages; a zero overwrites like any value.
+    // Across the board's storage pages (0x1000 starts one); a zero overwrites like any value.
     burstWrite(1, 0xFFE, true, {0x0A, 0x0B, 0x0C, 0x0D});
     burstWrite(1, 0xFFF, true, {0x0000});
     EXPECT_EQ(burstRead(1, 0xFFD, true, 6),
