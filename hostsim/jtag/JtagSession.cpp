@@ -4,6 +4,7 @@
 #include <cstring>
 #include <map>
 #include <memory>
+#include <set>
 
 namespace OrvSim {
 
@@ -14,6 +15,12 @@ std::mutex registryMutex;
 std::map<uint32_t, std::unique_ptr<JtagSession>>& registry() {
     static auto* sessions = new std::map<uint32_t, std::unique_ptr<JtagSession>>();
     return *sessions;
+}
+
+// The handles of the sessions whose used_ is set.
+std::set<uint32_t>& usedSet() {
+    static auto* handles = new std::set<uint32_t>();
+    return *handles;
 }
 
 // "0x" and ceil(bitCount/4) upper-case digits of the bits, bit k of the text's number being
@@ -53,20 +60,19 @@ size_t byteCount(uint32_t bitCount) {
 JtagSession& JtagSession::get(uint32_t handle) {
     // Most calls come for the session of the previous call on the same thread.
     thread_local JtagSession* last = nullptr;
-    if (last != nullptr && last->handle_ == handle) return *last;
+    if (last != nullptr && last->handle_ == handle && last->used_.load(std::memory_order_relaxed))
+        return *last;
     std::lock_guard<std::mutex> guard(registryMutex);
     auto& slot = registry()[handle];
     if (!slot) slot.reset(new JtagSession(handle));
     last = slot.get();
+    if (!last->used_.exchange(true)) usedSet().insert(handle);
     return *last;
 }
 
-std::vector<uint32_t> JtagSession::knownHandles() {
+std::vector<uint32_t> JtagSession::usedHandles() {
     std::lock_guard<std::mutex> guard(registryMutex);
-    std::vector<uint32_t> handles;
-    handles.reserve(registry().size());
-    for (const auto& entry : registry()) handles.push_back(entry.first);
-    return handles;
+    return std::vector<uint32_t>(usedSet().begin(), usedSet().end());
 }
 
 void JtagSession::queueWrite(JtagWriteRunner runner, void* context, const JtagCommand& command,
@@ -157,6 +163,9 @@ void JtagSession::reset() {
     pending_.clear();
     bytes_.clear();
     stats_ = JtagStats();
+    std::lock_guard<std::mutex> registryGuard(registryMutex);
+    used_.store(false);
+    usedSet().erase(handle_);
 }
 
 }  // namespace OrvSim

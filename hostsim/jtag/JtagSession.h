@@ -2,6 +2,7 @@
 // counters and trace. The core library pushes type-erased writes; a flush runs them.
 #pragma once
 
+#include <atomic>
 #include <cstdint>
 #include <mutex>
 #include <string>
@@ -31,8 +32,9 @@ public:
     // The session of handle, created on first use. Sessions are never destroyed, so the
     // reference stays valid for the life of the process.
     static JtagSession& get(uint32_t handle);
-    // Every handle used so far, ascending.
-    static std::vector<uint32_t> knownHandles();
+    // The handles used since their session was last reset, ascending: what a fresh host has
+    // to end, however many sessions the process has seen.
+    static std::vector<uint32_t> usedHandles();
 
     uint32_t handle() const { return handle_; }
 
@@ -53,7 +55,7 @@ public:
     JtagStats takeStats();
     // Sends what is queued (a closing cable flushes), then empties the queue. Counters stay.
     void end();
-    // Counters back to zero as well, for a fresh host.
+    // Counters back to zero as well, for a fresh host; the session counts as unused again.
     void reset();
 
     std::recursive_timed_mutex& targetLock() { return targetLock_; }
@@ -72,6 +74,7 @@ private:
     void runPendingLocked();
 
     const uint32_t handle_;
+    std::atomic<bool> used_{false};
     std::recursive_timed_mutex targetLock_;
     // Guards the queue and counters; recursive so that a sink may read counters.
     std::recursive_mutex mutex_;

@@ -134,6 +134,12 @@ TEST_F(OrvJtagTest, AFreshHostEndsEverySessionButKeepsItsListeners) {
     // The sinks are gone too.
     OrvJtag_session_sendMessage(HANDLE, 256, "after reset");
     EXPECT_FALSE(hasMessage(256, "after reset"));
+
+    // The next fresh host ends only what was used since (11 by takeStats): 11 again, not 12.
+    listener->ended.clear();
+    OrvSim::resetHost();
+    EXPECT_EQ(std::count(listener->ended.begin(), listener->ended.end(), 11u), 1);
+    EXPECT_EQ(std::count(listener->ended.begin(), listener->ended.end(), 12u), 0);
 }
 
 }  // namespace
