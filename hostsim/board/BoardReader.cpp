@@ -285,7 +285,7 @@ private:
         getFlag("clockRunning", config.clockRunning);
         get("busErrors", Range{0, 3, false}, config.busErrors);
 
-        std::vector<std::unique_ptr<BoardSlave>> slaves(config.slaveCount);
+        std::vector<std::optional<BoardSlave>> slaves(config.slaveCount);
         if (value.contains("slaves")) {
             const json& entries = value.at("slaves");
             const std::string slavesPath = at(path, "slaves");
@@ -307,7 +307,7 @@ private:
         return std::make_unique<BusMaster>(config, std::move(slaves));
     }
 
-    std::unique_ptr<BoardSlave> slave(const json& value, const std::string& path) const {
+    BoardSlave slave(const json& value, const std::string& path) const {
         static const char* const IDENT_KEYS[BusMaster::IDENT_COUNT] = {
             "slaveType",      "driverVersion", "coreType", "cgVersion",
             "cgAlphaVersion", "edaVersion",    "word6",    "nextSlave"};
@@ -315,16 +315,16 @@ private:
         checkKeys(value, path,
                   {"slaveType", "driverVersion", "coreType", "cgVersion", "cgAlphaVersion",
                    "edaVersion", "word6", "nextSlave", "faulty", "memory"});
-        auto result = std::make_unique<BoardSlave>();
+        BoardSlave result;
         for (uint32_t i = 0; i < BusMaster::IDENT_COUNT; ++i) {
             const char* key = IDENT_KEYS[i];
             if (value.contains(key)) {
-                result->ident[i] =
+                result.ident[i] =
                     uint16_t(unsignedNumber(value.at(key), at(path, key), U16_MAX, true));
             }
         }
-        if (value.contains("faulty")) result->faulty = flag(value.at("faulty"), at(path, "faulty"));
-        if (value.contains("memory")) memory(value.at("memory"), at(path, "memory"), *result);
+        if (value.contains("faulty")) result.faulty = flag(value.at("faulty"), at(path, "faulty"));
+        if (value.contains("memory")) memory(value.at("memory"), at(path, "memory"), result);
         return result;
     }
 

@@ -76,33 +76,13 @@ constexpr uint32_t TRAILING_WRITE_BITS = 2;
 
 }  // namespace
 
-BusMaster::BusMaster(const MasterConfig& config, std::vector<std::unique_ptr<BoardSlave>> slaves)
+BusMaster::BusMaster(const MasterConfig& config, std::vector<std::optional<BoardSlave>> slaves)
     : config_(config),
       slaves_(std::move(slaves)),
       busErrors_(config.busErrors & 3u),
       clockState_(config.clockPolls == -1 ? ClockState::RELOCKING : ClockState::LOCKED) {
     slaves_.resize(config_.slaveCount);
     slaveErrors_.assign(config_.slaveCount, 0);
-}
-
-BusMaster::BusMaster(const BusMaster& other)
-    : config_(other.config_),
-      slaveErrors_(other.slaveErrors_),
-      busErrors_(other.busErrors_),
-      resetWord_(other.resetWord_),
-      resetStrobe_(other.resetStrobe_),
-      resetState_(other.resetState_),
-      resetTargets_(other.resetTargets_),
-      resetReads_(other.resetReads_),
-      clockResetBit_(other.clockResetBit_),
-      clockState_(other.clockState_),
-      clockReads_(other.clockReads_),
-      transferControl_(other.transferControl_),
-      addressWord_(other.addressWord_) {
-    slaves_.reserve(other.slaves_.size());
-    for (const auto& slave : other.slaves_) {
-        slaves_.push_back(slave ? std::make_unique<BoardSlave>(*slave) : nullptr);
-    }
 }
 
 void BusMaster::write(uint32_t cmd, const uint8_t* data, uint32_t bitCount) {
@@ -241,7 +221,7 @@ BoardSlave* BusMaster::transferTarget() {
         return nullptr;
     }
     if (slaves_[index]->faulty) slaveErrors_[index] = 1;
-    return slaves_[index].get();
+    return &*slaves_[index];
 }
 
 void BusMaster::writeData(const uint8_t* data, uint32_t bitCount) {
@@ -320,7 +300,7 @@ void SlaveMemory::set(uint32_t address, uint16_t value) {
 
 // --- direct access --------------------------------------------------------------------------
 
-BoardSlave& BusMaster::existingSlave(uint32_t slave, uint32_t address) const {
+void BusMaster::checkDirectAccess(uint32_t slave, uint32_t address) const {
     if (slave >= slaves_.size() || !slaves_[slave]) {
         throw std::out_of_range("no slave at position " + std::to_string(slave) + " (slaveCount " +
                                 std::to_string(config_.slaveCount) + ")");
@@ -328,15 +308,16 @@ BoardSlave& BusMaster::existingSlave(uint32_t slave, uint32_t address) const {
     if (address > ADDRESS_MASK) {
         throw std::out_of_range("address " + hex(address) + " is out of range 0..0x1FFFF");
     }
-    return *slaves_[slave];
 }
 
 uint16_t BusMaster::peek(uint32_t slave, uint32_t address) const {
-    return fetch(existingSlave(slave, address), address);
+    checkDirectAccess(slave, address);
+    return fetch(*slaves_[slave], address);
 }
 
 void BusMaster::poke(uint32_t slave, uint32_t address, uint16_t value) {
-    BoardSlave& target = existingSlave(slave, address);
+    checkDirectAccess(slave, address);
+    BoardSlave& target = *slaves_[slave];
     if (address >= IDENT_FIRST && address < IDENT_FIRST + IDENT_COUNT) {
         target.ident[address - IDENT_FIRST] = value;
         return;
@@ -363,7 +344,8 @@ void BusMaster::setClockPolls(int32_t polls) {
 }
 
 void BusMaster::setSlaveFaulty(uint32_t slave, bool faulty) {
-    existingSlave(slave, 0).faulty = faulty;
+    checkDirectAccess(slave, 0);
+    slaves_[slave]->faulty = faulty;
 }
 
 }  // namespace OrvSim

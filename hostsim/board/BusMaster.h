@@ -2,9 +2,10 @@
 // the master, their memories, identification words and error bits.
 #pragma once
 
+#include <array>
 #include <cstdint>
 #include <memory>
-#include <array>
+#include <optional>
 #include <vector>
 
 namespace OrvSim {
@@ -72,11 +73,9 @@ public:
         CMD_CLOCK_CONTROL = 7,
     };
 
-    // slaves: one entry per position (slaveCount entries); null for an empty position.
-    BusMaster(const MasterConfig& config, std::vector<std::unique_ptr<BoardSlave>> slaves);
-    // A master in the same state, with slaves of its own.
-    BusMaster(const BusMaster& other);
-    BusMaster& operator=(const BusMaster&) = delete;
+    // slaves: one entry per position (slaveCount entries); empty for an empty position.
+    // A copy is a master in the same state with slaves of its own.
+    BusMaster(const MasterConfig& config, std::vector<std::optional<BoardSlave>> slaves);
 
     // One command; data holds bitCount bits, least significant first.
     void write(uint32_t cmd, const uint8_t* data, uint32_t bitCount);
@@ -108,7 +107,8 @@ private:
     enum class ClockState { LOCKED, IN_RESET, RELOCKING };
 
     void protocolError() { busErrors_ |= 2u; }
-    BoardSlave& existingSlave(uint32_t slave, uint32_t address) const;
+    // Throws std::out_of_range unless the position holds a slave and the address is a bus one.
+    void checkDirectAccess(uint32_t slave, uint32_t address) const;
 
     void writeResetControl(const uint8_t* data, uint32_t bitCount);
     uint32_t readMasterStatus();
@@ -129,7 +129,7 @@ private:
     static void store(BoardSlave& slave, uint32_t address, uint16_t value);
 
     MasterConfig config_;
-    std::vector<std::unique_ptr<BoardSlave>> slaves_;
+    std::vector<std::optional<BoardSlave>> slaves_;
     std::vector<uint8_t> slaveErrors_;
     uint32_t busErrors_;
 
