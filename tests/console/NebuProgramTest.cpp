@@ -124,56 +124,6 @@ TEST_F(NebuProgramTest, BadBoardFilesAreNamedAndTheConsoleDoesNotStart) {
     }
 }
 
-TEST_F(NebuProgramTest, PeekAndPokeReachTheBoardDirectly) {
-    Result r = runOnBoard({"-e", "peek 0 1 0 0x10", "-e", "peek 0 1 0 0x20 3", "-e",
-                           "poke 0 1 0 0x21 0xbeef 7", "-e", "peek 0 1 0 0x1F 4", "-e",
-                           "peek 0 1 0 0x1FFFF 2", "-e", "poke 0 1 0 0x1FFFF 5 6", "-e",
-                           "peek 0 1 0 0x1FFFF 2", "-e", "peek 0 1 0 0 0", "-e", "stats"});
-    EXPECT_EQ(r.err, "");
-    EXPECT_EQ(r.status, 0);
-    EXPECT_EQ(
-        lines(r.out),
-        (std::vector<std::string>{
-            "> peek 0 1 0 0x10", "peek=0x1234", "> peek 0 1 0 0x20 3", "peek=0x0001 0x0002 0x0003",
-            "> poke 0 1 0 0x21 0xbeef 7", "> peek 0 1 0 0x1F 4", "peek=0x0000 0x0001 0xBEEF 0x0007",
-            // the address wraps at the end of the bus
-            "> peek 0 1 0 0x1FFFF 2", "peek=0xAAAA 0x0000", "> poke 0 1 0 0x1FFFF 5 6",
-            "> peek 0 1 0 0x1FFFF 2", "peek=0x0005 0x0006", "> peek 0 1 0 0 0", "peek=",
-            // no JTAG was involved
-            "> stats", NO_JTAG_STATS}));
-}
-
-TEST_F(NebuProgramTest, BadPeekAndPokeWriteNothingAndTheConsoleGoesOn) {
-    const Result r = runOnBoard({"-e", "poke 0 1 0 0x10 1 0x10000", "-e", "poke 0 1 0 0x10 2 x",
-                                 "-e", "peek 0 1 0 0x20000", "-e", "peek 0 1 9 0", "-e",
-                                 "peek 0 2 0 0", "-e", "poke 0 1 0 0x10", "-e", "peek 0 1 0 0x10"});
-    EXPECT_EQ(r.status, 2);
-    EXPECT_EQ(lines(r.out),
-              (std::vector<std::string>{"> poke 0 1 0 0x10 1 0x10000", "> poke 0 1 0 0x10 2 x",
-                                        "> peek 0 1 0 0x20000", "> peek 0 1 9 0", "> peek 0 2 0 0",
-                                        "> poke 0 1 0 0x10", "> peek 0 1 0 0x10", "peek=0x1234"}));
-    const auto errors = lines(r.err);
-    ASSERT_EQ(errors.size(), 6u) << r.err;
-    EXPECT_EQ(errors[0], "nebu: VALUE 0x10000 does not fit 16 bits");
-    EXPECT_EQ(errors[1], "nebu: bad number 'x' for VALUE");
-    EXPECT_EQ(errors[2], "nebu: ADDRESS 0x20000 is outside the bus (0..0x1FFFF)");
-    EXPECT_EQ(errors[3].rfind("nebu: peek: ", 0), 0u);
-    EXPECT_EQ(errors[4].rfind("nebu: peek: ", 0), 0u);
-    EXPECT_EQ(errors[5], "nebu: usage: poke D C S ADDRESS VALUE...");
-}
-
-TEST_F(NebuProgramTest, UnknownCommandsAndBadNumbersAreUsageErrors) {
-    const Result r = runOnBoard({"-e", "frobnicate 1 2", "-e", "peek 0 1 0 0x1G", "-e",
-                                 "getSlaveCount 0 1", "-e", "peek 0 1 0 0x10"});
-    EXPECT_EQ(r.status, 2);
-    EXPECT_EQ(lines(r.out).front(), "> frobnicate 1 2");
-    EXPECT_EQ(lines(r.out).back(), "peek=0x1234");
-    const auto errors = lines(r.err);
-    ASSERT_GE(errors.size(), 2u);
-    EXPECT_EQ(errors[0], "nebu: unknown command 'frobnicate'");
-    EXPECT_EQ(errors[1], "nebu: bad number '0x1G' for ADDRESS");
-}
-
 TEST_F(NebuProgramTest, FunctionsThePluginDoesNotExportAreUnknownCommands) {
     // A host library exports none of the plug-in's functions.
     const std::string noExports =
@@ -190,23 +140,6 @@ TEST_F(NebuProgramTest, FunctionsThePluginDoesNotExportAreUnknownCommands) {
                   "OrvNebu_getSlaveCount)",
                   "nebu: unknown command 'scan' (the plug-in does not export "
                   "OrvNebu_getSlaveCount)"}));
-}
-
-TEST_F(NebuProgramTest, SessionsStatusAndStatsAreConsoleCommands) {
-    const Result r =
-        runOnBoard({"--session", "9", "-e", "stats", "-e", "session 3", "-e", "status off", "-e",
-                    "status on", "-e", "endSession", "-e", "endSession 9", "-e", "stats"});
-    EXPECT_EQ(r.err, "");
-    EXPECT_EQ(r.status, 0);
-    EXPECT_EQ(lines(r.out), (std::vector<std::string>{"> stats", NO_JTAG_STATS, "> session 3",
-                                                      "> status off", "> status on", "> endSession",
-                                                      "> endSession 9", "> stats", NO_JTAG_STATS}));
-
-    const Result bad = runOnBoard({"-e", "session -1", "-e", "endSession 1 2", "-e", "stats x"});
-    EXPECT_EQ(bad.status, 2);
-    EXPECT_EQ(lines(bad.err),
-              (std::vector<std::string>{"nebu: bad number '-1' for N",
-                                        "nebu: usage: endSession [N]", "nebu: usage: stats"}));
 }
 
 // The counters of a stats line, by name.
@@ -349,6 +282,71 @@ TEST_F(NebuProgramTest, DemoBoardDataDirAndPluginAreFoundBesideTheProgram) {
     const Result help = run({"--help"});
     EXPECT_EQ(help.status, 0);
     EXPECT_EQ(help.out.rfind("usage: nebu [--board FILE]", 0), 0u);
+}
+
+TEST_F(NebuProgramTest, CheckShowsWhereATranscriptDiffersAndUpdateWritesWhatRan) {
+    const std::string t = write("session.t",
+                                "# nebu --board board.json\n"
+                                "# slave 0, memory and identity\n"
+                                "> peek 0 1 0 0x10 2\n"
+                                "peek=0x1234 0x0001\n"
+                                "> getSlaveInfo 0 1 0 \"#note=kept\"\n"
+                                "> peek 0 1 0 0x1G\n"
+                                "# exit 0\n");
+    Result r = run({"check", t});
+    EXPECT_EQ(r.status, 1);
+    EXPECT_EQ(r.err, "");
+    EXPECT_EQ(r.out.substr(0, r.out.find("@@")),
+              t + ":4: output differs\n--- " + t + "\n+++ " + t + " (as run)\n");
+    EXPECT_EQ(r.out.substr(r.out.find("@@")),
+              "@@ -1,7 +1,21 @@\n"
+              " # nebu --board board.json\n"
+              " # slave 0, memory and identity\n"
+              " > peek 0 1 0 0x10 2\n"
+              "-peek=0x1234 0x0001\n"
+              "+peek=0x1234 0x0000\n"
+              " > getSlaveInfo 0 1 0 \"#note=kept\"\n"
+              "+rc=0x00000000\n"
+              "+\\#note=kept\n"
+              "+cg_alpha_ver=0\n"
+              "+cg_ver=0.0\n"
+              "+cg_ver.major=0\n"
+              "+cg_ver.minor=0\n"
+              "+core_type=0\n"
+              "+eda_ver=0.0\n"
+              "+eda_ver.major=0\n"
+              "+eda_ver.minor=0\n"
+              "+next_slave=0\n"
+              "+orv_drv_ver=0\n"
+              "+slave_type=68\n"
+              " > peek 0 1 0 0x1G\n"
+              "-# exit 0\n"
+              "+nebu: bad number '0x1G' for ADDRESS\n"
+              "+# exit 2\n"
+              "check: 1 transcript, 1 differs\n");
+
+    r = run({"check", "--update", t});
+    EXPECT_EQ(r.status, 0);
+    EXPECT_EQ(r.out, t + ": updated\ncheck: 1 transcript, 1 updated\n");
+    EXPECT_EQ(lines(readFile(t))[6], "\\#note=kept");
+    r = run({"check", t, t});
+    EXPECT_EQ(r.status, 0);
+    EXPECT_EQ(r.out, "check: 2 transcripts, 0 differ\n");
+}
+
+TEST_F(NebuProgramTest, CheckRefusesFilesThatAreNoTranscripts) {
+    const std::string noHeader = write("plain.t", "peek 0 1 0 0x10\n");
+    const std::string commands = write("commands.t", "# nebu -e stats\n# exit 0\n");
+    const Result r = run({"check", noHeader, commands, (dir_ / "absent.t").string()});
+    EXPECT_EQ(r.status, 2);
+    EXPECT_EQ(r.err, "nebu: " + noHeader +
+                         ":1: a transcript begins with '# nebu' and the console's options\n"
+                         "nebu: " +
+                         commands +
+                         ":1: only console options belong on the first line\n"
+                         "nebu: cannot open transcript " +
+                         (dir_ / "absent.t").string() + "\n");
+    EXPECT_EQ(run({"check"}).err, "nebu: check needs a transcript\n");
 }
 
 }  // namespace

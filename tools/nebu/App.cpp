@@ -10,6 +10,7 @@
 #include <string>
 #include <vector>
 
+#include "Check.h"
 #include "Console.h"
 #include "Lint.h"
 #include "Options.h"
@@ -43,30 +44,10 @@ struct HostReset {
 };
 }  // namespace
 
-int runNebu(int argc, char** argv, std::istream& in, std::ostream& out, std::ostream& err,
-            bool inIsTerminal) {
-    std::vector<std::string> args;
-    for (int i = 1; i < argc; ++i) args.emplace_back(argv[i]);
-    if (!args.empty() && args.front() == "lint") {
-        const std::string exeDir = executableDirectory(argc > 0 ? argv[0] : nullptr);
-        return runLint(std::vector<std::string>(args.begin() + 1, args.end()),
-                       exeDir + "/../share/orvnebu/data/", out, err);
-    }
+int runConsole(const Options& options, const std::string& exeDir, std::ostream& out,
+               std::ostream& err, const std::function<void(Console&)>& commands) {
     try {
-        const Options options = parseOptions(args);
-        if (options.help) {
-            out << usageText() << "Type 'help' at the prompt (or -e help) for the commands.\n";
-            return 0;
-        }
-        const std::string exeDir = executableDirectory(argc > 0 ? argv[0] : nullptr);
         const std::string share = exeDir + "/../share/orvnebu/";
-
-        std::ifstream scriptFile;
-        const bool scriptFromStdin = options.script == "-";
-        if (!options.script.empty() && !scriptFromStdin) {
-            scriptFile.open(options.script);
-            if (!scriptFile) throw UsageError("cannot open script " + options.script);
-        }
         auto board =
             loadBoard(options.boardFile.empty() ? share + "boards/demo.json" : options.boardFile);
 
@@ -79,17 +60,51 @@ int runNebu(int argc, char** argv, std::istream& in, std::ostream& out, std::ost
         Console console(PluginApi::resolve(plugin), out, err, options.session);
         console.setCable(options.cable);
         console.installSinks(options.trace);
-        if (scriptFile.is_open()) console.runStream(scriptFile, false);
-        if (scriptFromStdin) console.runStream(in, false);
-        for (const auto& command : options.commands) {
-            if (console.quitRequested()) break;
-            console.runLine(command);
-        }
-        if (options.script.empty() && options.commands.empty()) {
-            console.runStream(in, inIsTerminal);
-        }
+        commands(console);
         console.finish();
         return console.exitStatus();
+    } catch (const UsageError& e) {
+        out.flush();
+        err << "nebu: " << oneLine(e.what()) << std::endl;
+        return 2;
+    }
+}
+
+int runNebu(int argc, char** argv, std::istream& in, std::ostream& out, std::ostream& err,
+            bool inIsTerminal) {
+    std::vector<std::string> args;
+    for (int i = 1; i < argc; ++i) args.emplace_back(argv[i]);
+    const std::string exeDir = executableDirectory(argc > 0 ? argv[0] : nullptr);
+    if (!args.empty() && args.front() == "lint") {
+        return runLint(std::vector<std::string>(args.begin() + 1, args.end()),
+                       exeDir + "/../share/orvnebu/data/", out, err);
+    }
+    if (!args.empty() && args.front() == "check") {
+        return runCheck(std::vector<std::string>(args.begin() + 1, args.end()), exeDir, out, err);
+    }
+    try {
+        const Options options = parseOptions(args);
+        if (options.help) {
+            out << usageText() << "Type 'help' at the prompt (or -e help) for the commands.\n";
+            return 0;
+        }
+        std::ifstream scriptFile;
+        const bool scriptFromStdin = options.script == "-";
+        if (!options.script.empty() && !scriptFromStdin) {
+            scriptFile.open(options.script);
+            if (!scriptFile) throw UsageError("cannot open script " + options.script);
+        }
+        return runConsole(options, exeDir, out, err, [&](Console& console) {
+            if (scriptFile.is_open()) console.runStream(scriptFile, false);
+            if (scriptFromStdin) console.runStream(in, false);
+            for (const auto& command : options.commands) {
+                if (console.quitRequested()) break;
+                console.runLine(command);
+            }
+            if (options.script.empty() && options.commands.empty()) {
+                console.runStream(in, inIsTerminal);
+            }
+        });
     } catch (const UsageError& e) {
         out.flush();
         err << "nebu: " << oneLine(e.what()) << std::endl;
