@@ -2,6 +2,7 @@
 // console of its own, and what it prints (standard output, then standard error with each line
 // marked, then the exit status) must be NAME.out.
 #include <gtest/gtest.h>
+#include <unistd.h>
 
 #include <algorithm>
 #include <filesystem>
@@ -27,7 +28,9 @@ class TranscriptTest : public ::testing::TestWithParam<std::string> {};
 
 TEST_P(TranscriptTest, PrintsTheRecordedOutput) {
     const fs::path dir = NEBU_TEST_TRANSCRIPTS_DIR;
-    const fs::path err = fs::temp_directory_path() / ("nebu_transcript_" + GetParam() + ".err");
+    // Other builds may run the same transcript at the same time.
+    const fs::path err = fs::temp_directory_path() / ("nebu_transcript_" + GetParam() + "_" +
+                                                      std::to_string(getpid()) + ".err");
     const nebutest::Result result = nebutest::runNebu(
         {"--board", NEBU_TEST_BOARDS_DIR "/demo.json", "--data-dir", NEBU_TEST_DATA_DIR "/",
          "--plugin", NEBU_PLUGIN_PATH, (dir / (GetParam() + ".nebu")).string()},
