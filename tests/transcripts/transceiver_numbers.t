@@ -1,3 +1,6 @@
+# nebu
+# Number texts of the transceiver parameters are decimal in every family: the leading decimal
+# number of the text, 0 when there is none; hexadecimal, nan and inf texts are no exception.
 > initialize 0 2 0
 rc=0x00000000
 > initialize 0 2 1
@@ -50,4 +53,4 @@ refclk_freq=0x7D
 rc=0x00000000
 > getParameterChoices 0 2 4 line_rate refclk_freq=NAN
 rc=0x00000000
-exit status 0
+# exit 0
