@@ -4,6 +4,7 @@
 #include "Check.h"
 
 #include <algorithm>
+#include <cstdint>
 #include <filesystem>
 #include <fstream>
 #include <ostream>

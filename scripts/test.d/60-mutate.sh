@@ -1,0 +1,8 @@
+#!/usr/bin/env bash
+# Mutation pass: a fixed sample of faults planted in the plug-in (scripts/mutate, build-mutate/);
+# fails when the suite kills a smaller share of them than scripts/mutate.floor holds.
+set -euo pipefail
+root=$(cd "$(dirname "$0")/../.." && pwd)
+"$root/scripts/bootstrap" python3 ninja-build git
+exec python3 "$root/scripts/mutate" --sample "${NEBU_MUTATE_SAMPLE:-300}" --seed 1 \
+  --floor "$root/scripts/mutate.floor" --report "$root/build-mutate/sample-report.txt"
