@@ -36,24 +36,20 @@ std::shared_ptr<Board> getBoard() {
 }
 
 void endSession(uint32_t handle) {
-    JtagSession& session = JtagSession::get(handle);
-    for (OrvRT::SessionMessageListener* listener : listenersSnapshot()) {
-        listener->sessionEnded(handle);
-    }
+    const std::shared_ptr<JtagSession> session = JtagSession::get(handle);
+    notifySessionEnded(handle);
     for (OrvRT::Orv_Core* core : takeSessionCores(handle)) delete core;
-    session.end();
+    session->end();
+    JtagSession::forget(handle);
 }
 
 void resetHost() {
-    // Only the sessions used since the last reset can hold anything: a process that has seen
-    // many handles (a fuzzer) does not pay for all of them on every reset.
-    const std::vector<uint32_t> used = JtagSession::usedHandles();
-    for (uint32_t handle : used) endSession(handle);
+    for (uint32_t handle : JtagSession::handles()) endSession(handle);
+    forgetListeners();
     setMessageSink(nullptr);
     setTraceSink(nullptr);
     setBoard(nullptr);
     setDataDir(std::string());
-    for (uint32_t handle : used) JtagSession::get(handle).reset();
 }
 
 }  // namespace OrvSim
