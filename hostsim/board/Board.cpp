@@ -183,6 +183,18 @@ bool Board::commandFails(uint32_t device, uint32_t chain, uint32_t core, uint32_
     return c != nullptr && cmd < 32 && ((c->failingCommands >> cmd) & 1u) != 0;
 }
 
+bool Board::hasFailingCommands() const {
+    std::lock_guard<std::mutex> lock(impl_->mutex);
+    for (const BoardDevice& device : impl_->devices) {
+        for (const auto& chain : device.chains) {
+            for (const BoardCore& core : chain.second.cores) {
+                if (core.failingCommands != 0) return true;
+            }
+        }
+    }
+    return false;
+}
+
 uint16_t Board::peek(uint32_t device, uint32_t chain, uint32_t slave, uint32_t address) const {
     std::lock_guard<std::mutex> lock(impl_->mutex);
     return firstMaster(*impl_, device, chain).peek(slave, address);

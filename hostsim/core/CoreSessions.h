@@ -12,4 +12,8 @@ namespace OrvSim {
 // caller deletes them.
 std::vector<OrvRT::Orv_Core*> takeSessionCores(uint32_t handle);
 
+// Whether the board behind the sessions has a command channel fault at all (cheap; checked
+// before a command asks the board about its own).
+bool boardMayRefuseCommands();
+
 }  // namespace OrvSim

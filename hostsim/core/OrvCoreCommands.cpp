@@ -8,6 +8,7 @@
 #include "host/OrvCore.h"
 #include "hostsim/Sim.h"
 #include "hostsim/board/Board.h"
+#include "hostsim/core/CoreSessions.h"
 #include "hostsim/jtag/JtagSession.h"
 
 namespace {
@@ -49,13 +50,15 @@ uint32_t OrvCore_runCoreCommand(uint32_t handle, uint32_t device, uint32_t userC
     if ((dataIn == nullptr) == (dataOut == nullptr)) return RESULT_FAILED;
     const std::shared_ptr<OrvSim::JtagSession> session = OrvSim::JtagSession::get(handle);
     session->noteHostCall();
-    const std::shared_ptr<OrvSim::Board> board = OrvSim::getBoard();
     // A channel the board says is broken refuses before anything is shifted.
-    if (board != nullptr && board->commandFails(device, userChain, coreIndex, cmd)) {
-        throw std::runtime_error("Command " + std::to_string(cmd) + " to core " +
-                                 std::to_string(coreIndex) + " on user chain " +
-                                 std::to_string(userChain) + " of device " +
-                                 std::to_string(device) + " failed.");
+    if (OrvSim::boardMayRefuseCommands()) {
+        const std::shared_ptr<OrvSim::Board> board = OrvSim::getBoard();
+        if (board != nullptr && board->commandFails(device, userChain, coreIndex, cmd)) {
+            throw std::runtime_error("Command " + std::to_string(cmd) + " to core " +
+                                     std::to_string(coreIndex) + " on user chain " +
+                                     std::to_string(userChain) + " of device " +
+                                     std::to_string(device) + " failed.");
+        }
     }
     const OrvSim::JtagCommand command{device, userChain, coreIndex, cmd, bitCount};
     if (dataIn != nullptr) {
@@ -63,6 +66,7 @@ uint32_t OrvCore_runCoreCommand(uint32_t handle, uint32_t device, uint32_t userC
         return RESULT_OK;
     }
     session->sendQueued();
+    const std::shared_ptr<OrvSim::Board> board = OrvSim::getBoard();
     const bool ok = board != nullptr && board->runCommand(device, userChain, coreIndex, cmd,
                                                           nullptr, dataOut, bitCount);
     // Nothing answered: the caller reads zeros.

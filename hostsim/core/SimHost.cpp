@@ -1,5 +1,6 @@
 // What a host application drives: the board behind every session, the end of a session and
 // a fresh host for tests.
+#include <atomic>
 #include <mutex>
 
 #include "host/OrvCore.h"
@@ -13,6 +14,7 @@ namespace OrvSim {
 
 namespace {
 std::mutex boardMutex;
+std::atomic<bool> boardRefuses{false};
 // Never destroyed: plug-in code may still reach the host while the process ends.
 std::shared_ptr<Board>& currentBoard() {
     static auto* board = new std::shared_ptr<Board>();
@@ -25,10 +27,13 @@ void setBoard(std::shared_ptr<Board> board) {
     {
         std::lock_guard<std::mutex> guard(boardMutex);
         old = std::move(currentBoard());
+        boardRefuses.store(board != nullptr && board->hasFailingCommands());
         currentBoard() = std::move(board);
     }
     // The old board goes away outside the lock.
 }
+
+bool boardMayRefuseCommands() { return boardRefuses.load(std::memory_order_relaxed); }
 
 std::shared_ptr<Board> getBoard() {
     std::lock_guard<std::mutex> guard(boardMutex);

@@ -153,7 +153,7 @@ void JtagSession::lockTarget(uint32_t timeout) {
     }
     if (depth_++ == 0) holder_.store(std::this_thread::get_id());
     std::lock_guard<std::recursive_mutex> guard(mutex_);
-    ++lockUse_.takesByTimeout[timeout];
+    ++takesByTimeout_[timeout];
 }
 
 void JtagSession::unlockTarget() {
@@ -162,15 +162,16 @@ void JtagSession::unlockTarget() {
 }
 
 void JtagSession::noteHostCall() {
-    const bool held = holder_.load() == std::this_thread::get_id();
-    std::lock_guard<std::recursive_mutex> guard(mutex_);
-    ++(held ? lockUse_.callsHeld : lockUse_.callsUnheld);
+    const bool held = holder_.load(std::memory_order_relaxed) == std::this_thread::get_id();
+    (held ? callsHeld_ : callsUnheld_).fetch_add(1, std::memory_order_relaxed);
 }
 
 TargetLockUse JtagSession::takeLockUse() {
     std::lock_guard<std::recursive_mutex> guard(mutex_);
-    TargetLockUse taken = std::move(lockUse_);
-    lockUse_ = TargetLockUse();
+    TargetLockUse taken;
+    taken.takesByTimeout.swap(takesByTimeout_);
+    taken.callsHeld = callsHeld_.exchange(0);
+    taken.callsUnheld = callsUnheld_.exchange(0);
     return taken;
 }
 

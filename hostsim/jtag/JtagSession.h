@@ -4,6 +4,7 @@
 
 #include <atomic>
 #include <cstdint>
+#include <map>
 #include <memory>
 #include <mutex>
 #include <string>
@@ -95,7 +96,10 @@ private:
     std::vector<uint8_t> bytes_;  // bits of all pending writes, reused
     bool running_ = false;
     JtagStats stats_;
-    TargetLockUse lockUse_;
+    std::map<uint32_t, uint64_t> takesByTimeout_;
+    // Counted on every host operation, so without the mutex.
+    std::atomic<uint64_t> callsHeld_{0};
+    std::atomic<uint64_t> callsUnheld_{0};
 };
 
 // Whether a trace sink is set (cheap; checked before formatting a line).
