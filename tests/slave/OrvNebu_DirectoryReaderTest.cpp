@@ -92,6 +92,12 @@ TEST_F(DirectoryReaderTest, LinesFirstMatchWinsShortLinesSkippedLongLinesCut) {
                            "1,1,1,,r.csv\r\n",
                            1, 1),
               "r.csv");
+    // Ctrl-Z, the end of a text file to old Windows programs, is a character like any other.
+    EXPECT_EQ(registersFor("slave_type,orv_drv_ver_min,orv_drv_ver_max,registers,parameters\n"
+                           "2,1,1,\x1a.csv,\n"
+                           "1,1,1,after.csv,\n",
+                           1, 1),
+              "after.csv");
     EXPECT_NO_MESSAGES();
 }
 

@@ -683,7 +683,13 @@ int runLint(const std::vector<std::string>& args, const std::string& defaultData
         err << "nebu: lint: no data directory '" << dataDir << "'" << std::endl;
         return 2;
     }
-    if (dataDir.back() != '/') dataDir += '/';
+#if defined(_WIN32)
+    const bool separated = dataDir.back() == '/' || dataDir.back() == '\\';
+#else
+    const bool separated = dataDir.back() == '/';
+#endif
+    // '/' joins on Windows too, as the stand-in host joins the data directory.
+    if (!separated) dataDir += '/';
 
     Report report;
     Linter linter(dataDir, report);
