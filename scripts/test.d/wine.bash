@@ -50,14 +50,18 @@ compare_console() {
      "$root/scripts/wine-run" "$dir/wineprefix" "$loader" "$dir/bin/nebu.exe" "${args[@]}" \
        </dev/null >"$out/$name.windows.out" 2>"$out/$name.windows.err"
      echo "exit status $?" >>"$out/$name.windows.out")
+    local same=1
     for stream in out err; do
-      if ! diff -u "$out/$name.linux.$stream" "$out/$name.windows.$stream" >"$out/$name.$stream.diff"; then
+      if ! diff -u "$out/$name.linux.$stream" "$out/$name.windows.$stream" \
+        >"$out/$name.$stream.diff"; then
         head -40 "$out/$name.$stream.diff" >&2
-        echo "$pass: nebu.exe differs from the Linux console on $script (std$stream, $out/$name.$stream.diff)" >&2
-        status=1
+        echo "$pass: nebu.exe differs from the Linux console on $script" \
+          "(std$stream, ${out#"$root"/}/$name.$stream.diff)" >&2
+        same=0 status=1
       fi
     done
-    echo "$pass: nebu.exe $script: $(wc -l <"$out/$name.windows.out") lines as on Linux"
+    [ $same -eq 0 ] ||
+      echo "$pass: nebu.exe $script: $(wc -l <"$out/$name.windows.out") lines, the same as on Linux"
   done
   return $status
 }

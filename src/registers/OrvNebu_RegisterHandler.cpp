@@ -84,8 +84,8 @@ OrvNebu_RegisterHandler::Register* OrvNebu_RegisterHandler::findRegisterMutable(
 
 void OrvNebu_RegisterHandler::readRegistersFromFile(uint32_t handle) {
     const std::string fileName = getRegFilename();
-    // Binary: Windows' text mode would end the file at a Ctrl-Z; CR LF is stripped below.
-    std::ifstream in(fileName, std::ios::in | std::ios::binary);
+    std::ifstream in;
+    OrvNebu_CsvText::openFile(in, fileName);
     const auto cannotOpen = [&]() {
         std::string text = "Unable to open OrvNebu register file: " + fileName;
         OrvJtag_session_sendMessage(handle, SEVERITY_ERROR, text.c_str());

@@ -72,8 +72,8 @@ bool OrvNebu_DirectoryReader::parseLine(uint32_t lineNumber, const std::string& 
 }
 
 bool OrvNebu_DirectoryReader::getResult(Orv_HashMapCStr& entry) {
-    // Binary: Windows' text mode would end the file at a Ctrl-Z; CR LF is stripped below.
-    std::ifstream in(fileName_, std::ios::in | std::ios::binary);
+    std::ifstream in;
+    OrvNebu_CsvText::openFile(in, fileName_);
     std::string line;
     bool haveHeader = in.is_open() && static_cast<bool>(std::getline(in, line));
     // A path that opens but cannot be read (a directory on POSIX systems; Windows does not open

@@ -144,6 +144,14 @@ TEST_F(DirectoryReaderTest, RegisterFileNameKeepsItsBlanks) {
                              "0x11,1,1, regs.csv,\n"),
               ORVNEBU_FAILED);
     EXPECT_MESSAGE(256, "Unable to open OrvNebu register file: " + data_.dir() + " regs.csv");
+    // Windows would open regs.csv for these names: the plug-in does not, there either.
+    for (const std::string name : {"regs.csv  ", "regs.csv."}) {
+        EXPECT_EQ(initializeWith("slave_type,orv_drv_ver_min,orv_drv_ver_max,registers,parameters\n"
+                                 "0x11,1,1," +
+                                 name + ",\n"),
+                  ORVNEBU_FAILED);
+        EXPECT_MESSAGE(256, "Unable to open OrvNebu register file: " + data_.dir() + name);
+    }
 }
 
 TEST(SlaveFactoryRecords, FourteenRecordsSortedWithTheirVersionRanges) {
