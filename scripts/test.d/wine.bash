@@ -13,8 +13,24 @@ mingw_build() {
   cmake --build "$dir" -j "$jobs"
 }
 
-# wine_probe ARCH DIR LOADER: a hello program of this cross compiler runs under LOADER. The
-# first run makes the Wine prefix, before ctest starts tests in parallel.
+# wine_server DIR ARG...: the Wine server of the pass's prefix (-p: stay, -w: wait for its end,
+# -k: stop).
+wine_server() {
+  local dir=$1 server
+  shift
+  server=$(command -v wineserver || true)
+  for candidate in /usr/lib/wine/wineserver /usr/lib/wine/wineserver64 /usr/lib/wine/wineserver32; do
+    [ -n "$server" ] || [ ! -x "$candidate" ] || server=$candidate
+  done
+  [ -n "$server" ] || return 1
+  WINEPREFIX="$dir/wineprefix" "$server" "$@" </dev/null >/dev/null 2>&1
+}
+
+# wine_probe ARCH DIR LOADER: a hello program of this cross compiler runs under LOADER. Makes
+# the Wine prefix and leaves a Wine server running for the pass (stopped when the pass ends):
+# without it every test program pays seconds for a new one. The server and the programs Wine
+# starts beside it (services, devices) hold no terminal or pipe of ours: they would keep a
+# test's output open and ctest waiting for it.
 wine_probe() {
   local arch=$1 dir=$2 loader=$3 probe="$2/probe"
   mkdir -p "$probe"
@@ -23,10 +39,12 @@ wine_probe() {
     skip "$arch-w64-mingw32-g++-posix cannot build a probe program"
   timeout 600 "$root/scripts/wine-run" "$dir/wineprefix" "$loader" wineboot -i \
     </dev/null >"$probe/wineboot.log" 2>&1 || true
-  local said
-  said=$(timeout 120 "$root/scripts/wine-run" "$dir/wineprefix" "$loader" "$probe/hello.exe" \
-    </dev/null 2>"$probe/hello.err" | tr -d '\r') || true
-  [ "$said" = "hello from Windows" ] ||
+  wine_server "$dir" -w || true
+  wine_server "$dir" -p || true
+  trap 'wine_server "'"$dir"'" -k || true' EXIT
+  timeout 120 "$root/scripts/wine-run" "$dir/wineprefix" "$loader" "$probe/hello.exe" \
+    </dev/null >"$probe/hello.out" 2>"$probe/hello.err" || true
+  [ "$(tr -d '\r' <"$probe/hello.out")" = "hello from Windows" ] ||
     skip "$loader cannot run a $arch Windows probe program ($(head -c 200 "$probe/hello.err" | tr '\n' ' '))"
 }
 
