@@ -49,7 +49,7 @@ wine_probe() {
 }
 
 # compare_console DIR LOADER: nebu.exe (loading orvnebu.dll beside it) runs the demo tour and
-# the valgrind session script; standard output, standard error and exit status must equal those
+# the valgrind session scripts; standard output, standard error and exit status must equal those
 # of the Linux console (build/) line for line.
 compare_console() {
   local dir=$1 loader=$2 out="$1/console"
@@ -57,9 +57,10 @@ compare_console() {
   cmake --build "$root/build" -j "$jobs" --target nebu >/dev/null
   mkdir -p "$out"
   local name script args status=0
-  for script in scripts/demo.nebu tests/valgrind/session.nebu; do
+  for script in "$root/scripts/demo.nebu" "$root"/tests/valgrind/*.nebu; do
+    script=${script#"$root"/}
     name=$(basename "$script" .nebu)
-    # As scripts/demo and 30-valgrind.sh run them.
+    # As scripts/demo and 30-valgrind.sh run them (paths relative to the repository root).
     args=("$script")
     [ "$name" = demo ] || args=(--board boards/demo.json --data-dir data/ "$script")
     (cd "$root" && set +e
