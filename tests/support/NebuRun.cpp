@@ -136,12 +136,15 @@ int runProgram(const std::string& program, const std::vector<std::string>& args,
 Result runNebu(const std::vector<std::string>& args, const std::filesystem::path& stdinPath,
                const std::filesystem::path& stderrPath, const std::filesystem::path& cwd,
                bool mergeErr) {
-    const auto outPath = stderrPath.parent_path() / "stdout.txt";
+    auto outPath = stderrPath;
+    outPath += ".stdout";
     Result result;
     result.status = runProgram(NEBU_CONSOLE_PATH, args, stdinPath, outPath,
                                mergeErr ? outPath : stderrPath, cwd);
     result.out = readFile(outPath);
     if (!mergeErr) result.err = readFile(stderrPath);
+    std::error_code ignored;
+    std::filesystem::remove(outPath, ignored);
     return result;
 }
 

@@ -32,8 +32,9 @@ int runProgram(const std::string& program, const std::vector<std::string>& args,
                const std::filesystem::path& in, const std::filesystem::path& out,
                const std::filesystem::path& err, const std::filesystem::path& cwd = {});
 
-// nebu with the arguments, standard input from stdinPath; its standard output and error go
-// through files in the folder of stderrPath (merged into out when mergeErr).
+// nebu with the arguments, standard input from stdinPath; standard error goes through the file
+// stderrPath, standard output through stderrPath + ".stdout" (error merged into it when
+// mergeErr).
 Result runNebu(const std::vector<std::string>& args, const std::filesystem::path& stdinPath,
                const std::filesystem::path& stderrPath, const std::filesystem::path& cwd = {},
                bool mergeErr = false);
