@@ -22,6 +22,7 @@
 #include "Console.h"
 #include "Options.h"
 #include "UsageError.h"
+#include "hostsim/Sim.h"
 
 namespace nebu {
 
@@ -108,6 +109,9 @@ std::vector<std::string> runTranscript(const Transcript& t, const std::string& e
             printed[c] = output.str();
             output.str("");
         }
+        // The next transcript of this process meets a fresh host, not the listeners of a
+        // plug-in that is about to be unloaded.
+        OrvSim::resetHost();
     });
 
     std::vector<std::string> actual = {t.lines[0]};
