@@ -107,15 +107,6 @@ TEST(ParamChoiceAction, ReadingCorners) {
     EXPECT_EQ("Off", readMode(mode, {}));
     EXPECT_EQ("On", readMode(mode, {{"EN", "0x1"}, {"SEL", "0x0001"}}));
 
-    // The first match in index order wins even when a later choice matches more settings.
-    OrvNebu_ParamChoiceAction subset("S", 10002);
-    subset.addChoice("Enabled", 0);
-    subset.addChoiceRegSetting(0, 1, "EN", "1");
-    subset.addChoice("EnabledFast", 1);
-    subset.addChoiceRegSetting(1, 1, "EN", "1");
-    subset.addChoiceRegSetting(1, 1, "FAST", "1");
-    EXPECT_EQ("Enabled", readMode(subset, {{"EN", "1"}, {"FAST", "1"}}));
-
     // A parameter without choices reads as empty and lists none (clearing the list).
     OrvNebu_ParamChoiceAction none("N", 10002);
     EXPECT_EQ("", readMode(none, {}));

@@ -78,19 +78,6 @@ TEST_F(OrvCoreCommandsTest, WritesWaitForAFlushAndFlushesAreCounted) {
     EXPECT_EQ(again.commands + again.flushes + again.roundTrips + again.writeBits, 0u);
 }
 
-TEST_F(OrvCoreCommandsTest, AReadSendsTheQueueFirstInOneRoundTrip) {
-    stats();
-    singleWrite(1, 0x20, 0x5555);
-    EXPECT_EQ(singleRead(1, 0x20), 0x5555u);
-    EXPECT_EQ(singleRead(1, 0x10), 0x1234u);
-    const OrvSim::JtagStats s = stats();
-    EXPECT_EQ(s.commands, 9u);
-    EXPECT_EQ(s.writeBits, 29u + 19u + 18u + 2 * (29u + 19u));
-    EXPECT_EQ(s.readBits, 32u);
-    EXPECT_EQ(s.flushes, 0u);
-    EXPECT_EQ(s.roundTrips, 2u);
-}
-
 TEST_F(OrvCoreCommandsTest, StatusAndCountReadsSendTheQueueAndAreCounted) {
     stats();
     singleWrite(1, 0x30, 0x0042);
@@ -110,36 +97,6 @@ TEST_F(OrvCoreCommandsTest, StatusAndCountReadsSendTheQueueAndAreCounted) {
     EXPECT_EQ(s.statusReads, 2u);
     EXPECT_EQ(s.roundTrips, 2u);
     EXPECT_EQ(s.commands, 6u);
-}
-
-TEST_F(OrvCoreCommandsTest, TraceLinesShowEachOperationAsItHappens) {
-    enableTrace();
-    singleWrite(1, 0x10, 0xBEEF);
-    EXPECT_EQ(trace().size(), 3u);  // write lines when issued, before any flush
-    OrvJtag_target_flush(HANDLE);
-    write(4, 0xFFFFFFFF, 29);  // bits above the count are not part of the word
-    write(7, 1, 4);
-    EXPECT_EQ(singleRead(1, 0x10), 0xBEEFu);
-    OrvRT::Orv_ByteBuffer status(154, 10, 10);
-    OrvRT::Orv_CoreComm::getCoreStatus(HANDLE, ORV_CORE_REF{DEVICE, CHAIN, 0}, nullptr, status,
-                                       1232);
-    uint32_t count = 0;
-    OrvCore_getCoreCount(HANDLE, DEVICE, CHAIN, &count);  // counted, not traced
-    EXPECT_EQ(trace(), (std::vector<std::string>{
-                           "jtag write cmd=4 bits=29 data=0x00100000",
-                           "jtag write cmd=5 bits=19 data=0x20010",
-                           "jtag write cmd=6 bits=18 data=0x0BEEF",
-                           "jtag flush",
-                           "jtag write cmd=4 bits=29 data=0x1FFFFFFF",
-                           "jtag write cmd=7 bits=4 data=0x1",
-                           "jtag write cmd=4 bits=29 data=0x00100000",
-                           "jtag write cmd=5 bits=19 data=0x00010",
-                           "jtag read cmd=6 bits=16 data=0xBEEF",
-                           "jtag status device=0 chain=1 core=0 type=3",
-                       }));
-    OrvSim::setTraceSink(nullptr);
-    OrvJtag_target_flush(HANDLE);
-    EXPECT_EQ(traceStartingWith("jtag flush").size(), 1u);
 }
 
 TEST_F(OrvCoreCommandsTest, TraceShowsWideWordsWithAllTheirDigits) {

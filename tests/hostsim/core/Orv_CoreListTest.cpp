@@ -35,21 +35,6 @@ protected:
     int deletions = 0;
 };
 
-TEST_F(Orv_CoreListTest, TheBaseCoreKeepsWhatItWasGiven) {
-    const uint8_t extra[3] = {1, 2, 3};
-    Orv_Core base(9, ORV_CORE_REF{2, 3, 4}, ORV_CORE_INFO{{1, 14, 5, 6, 7}}, extra, 3);
-    EXPECT_EQ(base.getHandle(), 9u);
-    EXPECT_EQ(base.getDeviceIndex(), 2u);
-    EXPECT_EQ(base.getUserRegNumber(), 3u);
-    EXPECT_EQ(base.getCoreIndex(), 4u);
-    EXPECT_EQ(base.getCoreRef().coreIndex, 4u);
-    EXPECT_EQ(base.getCoreInfo().word[1], 14u);
-    EXPECT_EQ(base.getCoreInfo().word[4], 7u);
-    EXPECT_FALSE(base.isOrvNebuSlave());  // host cores are not bus slaves
-    Orv_Core noData(9, ORV_CORE_REF{0, 0, 0}, ORV_CORE_INFO{}, nullptr, 100);  // no bytes to copy
-    EXPECT_EQ(noData.getCoreInfo().word[1], 0u);
-}
-
 TEST_F(Orv_CoreListTest, AddedCoresAreFoundByReferenceInTheirSessionOnly) {
     TrackedCore* a = core(0, 1, 2);
     Orv_CoreList::addCore(HANDLE, a);
