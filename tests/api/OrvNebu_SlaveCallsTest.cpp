@@ -212,37 +212,3 @@ TEST_F(SlaveCallsTest, RawCallsCheckTheirArguments) {
 }
 
 }  // namespace
-
-namespace {
-
-class DemoDataTest : public TestHost {};
-
-// The shipped directory and register files against the shipped board.
-TEST_F(DemoDataTest, DemoBoardSlavesShowTheirRegisters) {
-    loadBoardFile(std::string(NEBU_TEST_BOARDS_DIR) + "/demo.json");
-    for (uint32_t s = 0; s < 3; ++s) {
-        ASSERT_EQ(OrvNebu_initialize(HANDLE, ORV_SLAVE_REF{0, 1, s}), ORVNEBU_OK) << s;
-    }
-    ORV_HASHMAP_HANDLE ctrl = makeMap();
-    ASSERT_EQ(OrvNebu_getRegisters(HANDLE, ORV_SLAVE_REF{0, 1, 0}, &ctrl), ORVNEBU_OK);
-    EXPECT_EQ(mapOf(ctrl)["CTRL_ENABLE"], "1");
-    EXPECT_EQ(mapOf(ctrl)["BUILD_ID"], "123400FF");
-    EXPECT_EQ(mapOf(ctrl)["LANE_MAP"], "AC");  // 0x35 read from bit 0 upwards
-    EXPECT_EQ(mapOf(ctrl)["PATTERN"], "9A5");
-    EXPECT_EQ(mapOf(ctrl)["TIMESTAMP"], "12ABCD");
-    EXPECT_EQ(mapOf(ctrl).count("DEBUG_TAP"), 0u);
-
-    ORV_HASHMAP_HANDLE counters = makeMap({{"EVENT_COUNT", ""}, {"THRESHOLD", ""}});
-    ASSERT_EQ(OrvNebu_getRegisters(HANDLE, ORV_SLAVE_REF{0, 1, 1}, &counters), ORVNEBU_OK);
-    EXPECT_EQ(mapOf(counters)["EVENT_COUNT"], "02000100");
-    EXPECT_EQ(mapOf(counters)["THRESHOLD"], "400");
-
-    ORV_HASHMAP_HANDLE gpio = makeMap({{"GPIO_OUT", ""}, {"GPIO_DIR", ""}, {"GPIO_IN", ""}});
-    ASSERT_EQ(OrvNebu_getRegisters(HANDLE, ORV_SLAVE_REF{0, 1, 2}, &gpio), ORVNEBU_OK);
-    EXPECT_EQ(mapOf(gpio)["GPIO_OUT"], "FE");
-    EXPECT_EQ(mapOf(gpio)["GPIO_DIR"], "CA");
-    EXPECT_EQ(mapOf(gpio)["GPIO_IN"], "EF");
-    EXPECT_NO_MESSAGES();
-}
-
-}  // namespace

@@ -51,15 +51,6 @@ TEST(CommandLineTest, NumbersAreDecimalOrHexWithin32Bits) {
     }
 }
 
-TEST(CommandLineTest, BadNumberMessageNamesTheWordAndItsRole) {
-    try {
-        parseNumber("12z", "ADDRESS");
-        FAIL() << "no error";
-    } catch (const UsageError& e) {
-        EXPECT_STREQ(e.what(), "bad number '12z' for ADDRESS");
-    }
-}
-
 TEST(CommandLineTest, MapWordsSplitAtTheFirstEquals) {
     using Entry = std::pair<std::string, std::string>;
     EXPECT_EQ(splitMapWord("CTRL"), (Entry{"CTRL", ""}));

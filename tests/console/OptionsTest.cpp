@@ -7,20 +7,6 @@
 namespace nebu {
 namespace {
 
-TEST(OptionsTest, DefaultsLeaveTheLocationsToTheProgram) {
-    const Options o = parseOptions({});
-    EXPECT_TRUE(o.boardFile.empty());
-    EXPECT_TRUE(o.dataDir.empty());
-    EXPECT_TRUE(o.pluginPath.empty());
-    EXPECT_EQ(o.session, 1u);
-    EXPECT_FALSE(o.trace);
-    EXPECT_FALSE(o.help);
-    EXPECT_TRUE(o.commands.empty());
-    EXPECT_TRUE(o.script.empty());
-    EXPECT_EQ(o.cable.tckMhz, 30.0);
-    EXPECT_EQ(o.cable.roundTripUs, 125.0);
-}
-
 TEST(OptionsTest, EveryOptionInBothSpellings) {
     const Options o =
         parseOptions({"--board", "b.json", "--data-dir=/d", "--session", "0x10", "--trace",
