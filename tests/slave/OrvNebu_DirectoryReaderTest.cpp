@@ -1,5 +1,7 @@
 // The directory file: header rules, number bases of the key columns, first match wins, and
 // each failure with its messages as OrvNebu_initialize reports them.
+#include <filesystem>
+
 #include "slave/OrvNebu_DirectoryReader.h"
 #include "slave/OrvNebu_SlaveFactory.h"
 #include "support/RegsFixture.h"
@@ -115,6 +117,16 @@ TEST_F(DirectoryReaderTest, MissingFileAndMissingEntry) {
     clearMessages();
     EXPECT_EQ(initialize(0), ORVNEBU_FAILED);
     auto m = messages();
+    ASSERT_EQ(m.size(), 2u);
+    EXPECT_EQ(m[0].severity, 256u);
+    EXPECT_EQ(m[0].text, "Unable to open " + data_.path("nowhere") + "/orvnebu_directory.csv");
+    EXPECT_EQ(m[1].severity, 32768u);
+
+    // A directory in the file's place cannot be opened as a file either.
+    std::filesystem::create_directories(data_.path("nowhere") + "/orvnebu_directory.csv");
+    clearMessages();
+    EXPECT_EQ(initialize(0), ORVNEBU_FAILED);
+    m = messages();
     ASSERT_EQ(m.size(), 2u);
     EXPECT_EQ(m[0].severity, 256u);
     EXPECT_EQ(m[0].text, "Unable to open " + data_.path("nowhere") + "/orvnebu_directory.csv");

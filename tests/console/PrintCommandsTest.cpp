@@ -1,5 +1,5 @@
-// The console's printRegisterFile: the file image as the default register handler reads it,
-// and a file that cannot be read reported on the session channel with exit status 1.
+// The console's print commands: the file image as the library's reader reads it, and a file
+// that cannot be read reported on the session channel with exit status 1.
 #include <gtest/gtest.h>
 
 #include <memory>
@@ -12,7 +12,7 @@
 namespace nebu {
 namespace {
 
-class PrintRegisterFileTest : public TestHost {
+class PrintCommandsTest : public TestHost {
 protected:
     void SetUp() override {
         TestHost::SetUp();
@@ -36,7 +36,7 @@ protected:
     std::unique_ptr<Console> console_;
 };
 
-TEST_F(PrintRegisterFileTest, PrintsTheImageOrTheReadersMessages) {
+TEST_F(PrintCommandsTest, PrintsTheImageOrTheReadersMessages) {
     dir_.write("r.csv", "h\r\nA,0b,0,3,0,x,wr,,y,extra,more\r\nB,1,0,0,0,,,,n\r\n");
     const std::string path = dir_.path("r.csv");
     EXPECT_EQ(run("printRegisterFile " + path),
@@ -54,6 +54,17 @@ TEST_F(PrintRegisterFileTest, PrintsTheImageOrTheReadersMessages) {
                   dir_.path("none.csv") + "\n");
     EXPECT_EQ(console_->exitStatus(), 1);
     EXPECT_EQ(err_.str(), "");
+}
+
+TEST_F(PrintCommandsTest, ParameterFileIsPrintedAsItIsNow) {
+    const std::string path = dir_.path("p.csv");
+    dir_.write("p.csv", "h\nM,0,a,R=01\n");
+    EXPECT_EQ(run("printParameterFile " + path), "> printParameterFile " + path + "\nh\nM,0,a,R=01\n");
+    // Changed within the same run: the new text is printed, not a remembered one.
+    dir_.write("p.csv", "H\nN,0,b,\nN,1,c,S=1\n");
+    EXPECT_EQ(run("printParameterFile " + path),
+              "> printParameterFile " + path + "\nH\nN,0,b\nN,1,c,S=1\n");
+    EXPECT_EQ(console_->exitStatus(), 0);
 }
 
 }  // namespace
