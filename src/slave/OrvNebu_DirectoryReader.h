@@ -4,7 +4,6 @@
 
 #include <cstdint>
 #include <string>
-#include <vector>
 
 #include "host/OrvTypes.h"
 
@@ -25,19 +24,11 @@ private:
                             int32_t driverVersion);
 
     bool getResult(Orv_HashMapCStr& entry);
-    bool parseHeader(const std::string& line);
-    bool parseLine(uint32_t lineNumber, const std::string& line, Orv_HashMapCStr& entry);
 
-    std::vector<std::string> headerFields_;
     uint32_t handle_;
     std::string fileName_;
     int32_t slaveType_;
     int32_t driverVersion_;
-    int32_t slaveTypeColumn_ = -1;
-    int32_t minimumColumn_ = -1;
-    int32_t maximumColumn_ = -1;
-    int32_t highestKeyColumn_ = -1;
-    std::vector<std::string> fields_;
 };
 
 }  // namespace OrvRT

