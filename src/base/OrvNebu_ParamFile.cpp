@@ -173,8 +173,10 @@ void OrvNebu_ParamFile::print(std::ostream& out) const {
             const Choice& choice = parameter.choices[i];
             out << parameter.name << ',' << i << ',' << choice.name;
             for (const Setting& setting : choice.settings) {
-                Orv_NumberUtil::hexStr2BinStr(setting.value,
-                                              parameter.registerWidth(setting.registerName), bits);
+                // A setting of no bits has no digits to convert.
+                const uint32_t width = parameter.registerWidth(setting.registerName);
+                bits.clear();
+                if (width != 0) Orv_NumberUtil::hexStr2BinStr(setting.value, width, bits);
                 out << ',' << setting.registerName << '=' << bits;
             }
             out << std::endl;

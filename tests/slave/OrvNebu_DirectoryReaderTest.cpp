@@ -1,5 +1,8 @@
 // The directory file: header rules, number bases of the key columns, first match wins, and
 // each failure with its messages as OrvNebu_initialize reports them.
+#include <memory>
+#include <typeinfo>
+
 #include "slave/OrvNebu_DefaultSlave.h"
 #include "slave/OrvNebu_DirectoryReader.h"
 #include "slave/OrvNebu_SlaveFactory.h"
@@ -147,51 +150,71 @@ TEST_F(DirectoryReaderTest, RegisterFileNameKeepsItsBlanks) {
     EXPECT_MESSAGE(256, "Unable to open OrvNebu register file: " + data_.dir() + " regs.csv");
 }
 
-TEST(SlaveFactoryRecords, FourteenRecordsSortedWithTheClassEachBuilds) {
+// The class of the slave a creation function builds from the demo files of that class.
+class SlaveFactoryRecords : public TestHost {
+protected:
+    std::string built(OrvNebu_SlaveFactory::CreateFunction create, const std::string& files) {
+        const std::string base = std::string(NEBU_TEST_DATA_DIR) + "/" + files;
+        std::unique_ptr<OrvRT::OrvNebu_Slave> slave(
+            create(HANDLE, ORV_CORE_INFO{{1, 0, 0, 0, 0}}, ORV_SLAVE_REF{0, 1, 0},
+                   Orv_HashMapCStr(), base + "_regs.csv", base + "_params.csv"));
+        return slave ? typeid(*slave).name() : "<none>";
+    }
+};
+
+TEST_F(SlaveFactoryRecords, FourteenRecordsSortedWithTheirVersionRangesAndClasses) {
     using Table = OrvRT::OrvNebu_SlaveClassTable;
-    const std::vector<Table::Record>& r = Table::records();
-    ASSERT_EQ(r.size(), 14u);
-    const char* const D = "OrvNebu_DefaultSlave";
+    const OrvNebu_SlaveFactory::SlaveClasses& classes =
+        OrvRT::OrvNebu_TransceiverClasses::slaveClasses();
+    auto find = [&classes](int32_t type, int32_t version) {
+        return OrvNebu_SlaveFactory::findCreateFunction(type, version, classes);
+    };
+    const std::string plain = typeid(OrvRT::OrvNebu_DefaultSlave).name();
+    const std::string m3qrc = typeid(OrvRT::OrvNebu_VanduM3Qrc).name();
+    const std::string r2qra = typeid(OrvRT::OrvNebu_VanduR2Qra).name();
+    const std::string r3qra = typeid(OrvRT::OrvNebu_VanduR3Qra).name();
+    const std::string r3qrb = typeid(OrvRT::OrvNebu_VanduR3Qrb).name();
     const struct {
         int32_t type, min, max;
-        const char* className;
-    } expected[14] = {{0x00, 0, 0xFFFF, D},
-                      {0x01, 1, 1, "OrvNebu_VanduM3Qrc"},
-                      {0x11, 1, 0xFFFF, D},
-                      {0x12, 1, 0xFFFF, D},
-                      {0x13, 1, 0xFFFF, D},
-                      {0x14, 1, 0xFFFF, D},
-                      {0x15, 1, 0xFFFF, "OrvNebu_VanduR3Qra"},
-                      {0x21, 1, 0xFFFF, D},
-                      {0x31, 1, 0xFFFF, D},
-                      {0x41, 1, 1, D},
-                      {0x42, 1, 1, "OrvNebu_VanduR2Qra"},
-                      {0x43, 1, 1, "OrvNebu_VanduR3Qra"},
-                      {0x44, 1, 1, "OrvNebu_VanduM3Qrc"},
-                      {0x45, 1, 1, "OrvNebu_VanduR3Qrb"}};
-    const auto& classes = OrvRT::OrvNebu_TransceiverClasses::slaveClasses();
+        std::string cls;
+        const char* files;  // demo files the class can read
+    } expected[14] = {{0x00, 0, 0xFFFF, plain, "ctrl"},        {0x01, 1, 1, m3qrc, "vandu_m3qrc"},
+                      {0x11, 1, 0xFFFF, plain, "ctrl"},        {0x12, 1, 0xFFFF, plain, "ctrl"},
+                      {0x13, 1, 0xFFFF, plain, "ctrl"},        {0x14, 1, 0xFFFF, plain, "ctrl"},
+                      {0x15, 1, 0xFFFF, r3qra, "vandu_r3qra"}, {0x21, 1, 0xFFFF, plain, "ctrl"},
+                      {0x31, 1, 0xFFFF, plain, "ctrl"},        {0x41, 1, 1, plain, "ctrl"},
+                      {0x42, 1, 1, r2qra, "vandu_r2qra"},      {0x43, 1, 1, r3qra, "vandu_r3qra"},
+                      {0x44, 1, 1, m3qrc, "vandu_m3qrc"},      {0x45, 1, 1, r3qrb, "vandu_r3qrb"}};
+    // The factory's table, with the creation functions the layer above enters.
+    const std::vector<Table::Record>& r = Table::records();
+    ASSERT_EQ(r.size(), 14u);
     for (size_t i = 0; i < r.size(); ++i) {
-        SCOPED_TRACE(i);
-        EXPECT_EQ(r[i].slaveType, expected[i].type);
-        EXPECT_EQ(r[i].minDriverVersion, expected[i].min);
-        EXPECT_EQ(r[i].maxDriverVersion, expected[i].max);
-        EXPECT_STREQ(Table::info(r[i].slaveClass).className, expected[i].className);
+        EXPECT_EQ(r[i].slaveType, expected[i].type) << i;
+        EXPECT_EQ(r[i].minDriverVersion, expected[i].min) << i;
+        EXPECT_EQ(r[i].maxDriverVersion, expected[i].max) << i;
+        const OrvNebu_SlaveFactory::CreateFunction create = classes.create[r[i].slaveClass];
+        EXPECT_EQ(built(create, expected[i].files), expected[i].cls) << i;
+        // The table names the class that is built (the file tools read the name).
+        EXPECT_NE(expected[i].cls.find(Table::info(r[i].slaveClass).className), std::string::npos)
+            << i;
         // Every record is found for its own range, and only for it.
-        EXPECT_EQ(Table::find(r[i].slaveType, r[i].minDriverVersion), r[i].slaveClass);
-        EXPECT_EQ(Table::find(r[i].slaveType, r[i].maxDriverVersion + 1), Table::DEFAULT_SLAVE);
-        EXPECT_EQ(OrvNebu_SlaveFactory::findCreateFunction(r[i].slaveType, r[i].minDriverVersion,
-                                                           classes),
-                  classes.create[r[i].slaveClass]);
+        EXPECT_EQ(find(r[i].slaveType, r[i].minDriverVersion), create);
+        EXPECT_EQ(find(r[i].slaveType, r[i].maxDriverVersion), create);
     }
-    // The factory's creation function of each class is that class's own.
-    EXPECT_EQ(classes.create[Table::DEFAULT_SLAVE], &OrvRT::OrvNebu_DefaultSlave::create);
-    EXPECT_EQ(classes.create[Table::VANDU_M3QRC], &OrvRT::OrvNebu_VanduM3Qrc::create);
-    EXPECT_EQ(classes.create[Table::VANDU_R2QRA], &OrvRT::OrvNebu_VanduR2Qra::create);
-    EXPECT_EQ(classes.create[Table::VANDU_R3QRA], &OrvRT::OrvNebu_VanduR3Qra::create);
-    EXPECT_EQ(classes.create[Table::VANDU_R3QRB], &OrvRT::OrvNebu_VanduR3Qrb::create);
-    EXPECT_EQ(Table::find(0x44, 2), Table::DEFAULT_SLAVE);
-    EXPECT_EQ(Table::find(0x15, 7), Table::VANDU_R3QRA);
-    EXPECT_EQ(Table::find(0x99, 1), Table::DEFAULT_SLAVE);
+    // Outside every record the default slave is built, whatever files come with it.
+    const struct {
+        int32_t type, version;
+        const char* files;
+    } uncovered[] = {{0x44, 2, "vandu_m3qrc"},
+                     {0x42, 2, "vandu_r2qra"},
+                     {0x01, 0, "vandu_m3qrc"},
+                     {0x41, 2, "ctrl"},
+                     {0x99, 1, "ctrl"}};
+    for (const auto& u : uncovered) {
+        EXPECT_EQ(built(find(u.type, u.version), u.files), plain) << u.type << " " << u.version;
+    }
+    EXPECT_EQ(built(find(0x15, 7), "vandu_r3qra"), r3qra);
+    EXPECT_TRUE(noMessages());
 }
 
 }  // namespace
