@@ -55,6 +55,11 @@ void OrvNebu_CsvText::splitCommas(const std::string& line, std::vector<std::stri
     fields.resize(count);
 }
 
+bool OrvNebu_CsvText::hasInnerCR(const std::string& line) {
+    const size_t cr = line.find('\r');
+    return cr != std::string::npos && cr + 1 < line.size();
+}
+
 int32_t OrvNebu_CsvText::decimalToInt32(const std::string& text) {
     bool negative = false;
     size_t pos = skipBlanksAndSign(text, negative);

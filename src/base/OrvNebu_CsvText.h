@@ -13,6 +13,10 @@ public:
     // Splits at every comma; adjacent commas give empty fields. Reuses fields' storage.
     static void splitCommas(const std::string& line, std::vector<std::string>& fields);
 
+    // A carriage return before the end of the line: a file whose lines end in CR alone, read
+    // as one line.
+    static bool hasInnerCR(const std::string& line);
+
     // Leading blanks, optional sign, decimal digits; 0 without digits. Values beyond the
     // 32-bit range saturate at INT32_MIN/INT32_MAX.
     static int32_t decimalToInt32(const std::string& text);

@@ -59,8 +59,7 @@ void OrvNebu_DirectoryFile::readHeader(std::string line, Reading reading) {
                  "byte-order mark before the header: it is read as part of the first "
                  "column's name");
         }
-        const size_t cr = line.find('\r');
-        if (cr != std::string::npos && cr + 1 < line.size()) {
+        if (OrvNebu_CsvText::hasInnerCR(line)) {
             warn(1, 0,
                  "line ends are carriage returns alone: the whole file is read as one "
                  "header line");

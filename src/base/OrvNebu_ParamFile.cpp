@@ -72,6 +72,7 @@ OrvNebu_ParamFile::OrvNebu_ParamFile(const std::string& path, Reading reading) :
 
 void OrvNebu_ParamFile::readLines(std::istream& in, Reading reading) {
     std::getline(in, header_);
+    if (reading == EVERY_PROBLEM) checkFirstLine(header_);
     Orv_Util::stripEndingCR(header_);
     uint32_t lineNumber = 1;
     std::string line;
@@ -163,6 +164,40 @@ void OrvNebu_ParamFile::dropRefusedRows() {
     refusedName_ = parameters_.back().name;
     // A parameter whose first row is refused has no choices to offer.
     if (parameters_.back().choices.empty()) parameters_.pop_back();
+}
+
+void OrvNebu_ParamFile::checkFirstLine(const std::string& line) {
+    if (OrvNebu_CsvText::hasInnerCR(line)) {
+        warn(1,
+             "line ends are carriage returns alone: the plug-in reads the whole file as one "
+             "header line and finds no parameters");
+        return;
+    }
+    std::string first = line;
+    Orv_Util::stripEndingCR(first);
+    std::vector<std::string> fields;
+    OrvNebu_CsvText::splitCommas(first, fields);
+    Orv_Util::unQuote(fields);
+    if (fields.size() < 4 || fields[1].empty() ||
+        fields[1].find_first_not_of("0123456789") != std::string::npos) {
+        return;
+    }
+    for (size_t i = 3; i < fields.size(); ++i) {
+        const size_t eq = fields[i].find('=');
+        if (!fields[i].empty() &&
+            (eq == std::string::npos || eq == 0 ||
+             fields[i].find_first_not_of("01", eq + 1) != std::string::npos)) {
+            return;
+        }
+    }
+    warn(1,
+         "the first line is a parameter row, but the first line of a parameter file is its "
+         "header: choice " +
+             fields[2] + " of parameter " + fields[0] + " is lost");
+}
+
+void OrvNebu_ParamFile::warn(uint32_t line, const std::string& text) {
+    problems_.push_back({path_, line, 0, OrvNebu_FileProblem::WARNING, text, {}});
 }
 
 void OrvNebu_ParamFile::print(std::ostream& out) const {

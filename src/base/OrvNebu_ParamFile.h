@@ -72,6 +72,9 @@ private:
                        const std::vector<std::string>& fields, Choice& choice);
     void refuseLine(uint32_t lineNumber, const std::string& line, uint32_t column,
                     uint32_t severity, const std::string& text);
+    void warn(uint32_t line, const std::string& text);
+    // The first line is the header: a file without one loses its first row.
+    void checkFirstLine(const std::string& line);
     // Forgets the rows of the parameter just refused, and skips its further rows.
     void dropRefusedRows();
 

@@ -203,15 +203,16 @@ void OrvNebu_RegisterFile::warn(uint32_t line, uint32_t column, const std::strin
 }
 
 void OrvNebu_RegisterFile::checkFirstLine(const std::string& line) {
-    const size_t cr = line.find('\r');
-    if (cr != std::string::npos && cr + 1 < line.size()) {
+    if (OrvNebu_CsvText::hasInnerCR(line)) {
         warn(1, 0,
              "line ends are carriage returns alone: the plug-in reads the whole file as one "
              "header line and finds no registers");
         return;
     }
+    std::string first = line;
+    Orv_Util::stripEndingCR(first);
     std::vector<std::string> cols;
-    OrvNebu_CsvText::splitCommas(line.substr(0, cr), cols);
+    OrvNebu_CsvText::splitCommas(first, cols);
     Orv_Util::unQuote(cols);
     if (cols.size() >= MIN_COLUMNS && isHexNumber(cols[1]) && startsWithNumber(cols[2]) &&
         startsWithNumber(cols[3]) && startsWithNumber(cols[4])) {
@@ -245,20 +246,21 @@ void OrvNebu_RegisterFile::checkSlices() {
             const uint32_t common = mask & other.mask;
             if (common == 0) continue;
             const std::string shared = maskRange(common) + " of word 0x" + hexText(s.address);
-            const std::string otherLine = "(line " + std::to_string(other.slice->line) + ")";
             if (other.slice->registerName == s.registerName) {
                 if (s.registerName.empty()) continue;
                 // One register holding a bit twice: a write sets it from two digits, a read
                 // repeats it.
                 warn(s.line, 4,
-                     "register " + s.registerName + " overlaps itself " + otherLine + " in " +
-                         shared);
+                     "register " + s.registerName + " holds " + shared + " twice (also on line " +
+                         std::to_string(other.slice->line) +
+                         "): a value written does not read back");
             } else if (s.writable || other.slice->writable) {
                 // Two read-only views of the same bits (an alias, a mirrored order) cannot
                 // clobber each other; a writable one can.
                 warn(s.line, 4,
                      "register " + s.registerName + " overlaps register " +
-                         other.slice->registerName + " " + otherLine + " in " + shared);
+                         other.slice->registerName + " (line " + std::to_string(other.slice->line) +
+                         ") in " + shared);
             }
         }
         placed.push_back(Placed{mask, &s});
@@ -276,12 +278,12 @@ void OrvNebu_RegisterFile::checkSpan() {
         if (s.address < low) low = s.address, lowSlice = &s;
         if (s.address > high) high = s.address, highSlice = &s;
         if (high >= low && high - low >= MAX_BURST_WORDS) {
-            const RegisterSlice* other = &s == lowSlice ? highSlice : lowSlice;
             warn(s.line, 2,
-                 "words 0x" + hexText(low) + " to 0x" + hexText(high) + " (with line " +
-                     std::to_string(other->line) + ") span " + std::to_string(high - low + 1) +
+                 "registers span words 0x" + hexText(low) + " (line " +
+                     std::to_string(lowSlice->line) + ") to 0x" + hexText(high) + " (line " +
+                     std::to_string(highSlice->line) + "): " + std::to_string(high - low + 1) +
                      " words, more than one burst moves (" + std::to_string(MAX_BURST_WORDS) +
-                     "): a read of every register fails");
+                     "), so a read of every register fails");
             return;
         }
     }

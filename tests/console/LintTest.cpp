@@ -285,6 +285,62 @@ TEST_F(LintTest, EachKindOfProblemIsReportedWithItsFileAndLine) {
                     "refuses the file)\n";
          },
          12},
+        {"register file without its header line",
+         [&] {
+             replace("gpio_regs.csv",
+                     "name,address,order,start_bit,end_bit,description,access,"
+                     "reset,include\n",
+                     "");
+         },
+         [&] {
+             return file("gpio_regs.csv") +
+                    ":1: the first line is a register line, but the first line of a register "
+                    "file is its header: register GPIO_OUT is lost\n";
+         },
+         12},
+        {"parameter file without its header line",
+         [&] { replace("ctrl_params.csv", "parameter,choice_index,choice,settings\n", ""); },
+         [&] {
+             const std::string f = file("ctrl_params.csv");
+             return f +
+                    ":1: the first line is a parameter row, but the first line of a parameter "
+                    "file is its header: choice off of parameter mode is lost\n" +
+                    f + ":2: choice_index out-of-order (the plug-in refuses the file)\n";
+         },
+         12},
+        {"line ends of carriage returns alone", [&] { replaceAll("counter_regs.csv", "\n", "\r"); },
+         [&] {
+             return file("counter_regs.csv") +
+                    ":1: line ends are carriage returns alone: the plug-in reads the whole file "
+                    "as one header line and finds no registers\n";
+         },
+         12},
+        {"byte-order mark before the directory header",
+         [&] { replace("orvnebu_directory.csv", "slave_type", "\xEF\xBB\xBFslave_type"); },
+         [&] {
+             return dir +
+                    ":1: byte-order mark before the header: it is read as part of the first "
+                    "column's name\n" +
+                    dir + ":1: Unable to parse header of CSV file: " + dir +
+                    ": it has no slave_type column\n";
+         },
+         0, 0},
+        {"slices of one register on the same bits",
+         [&] { append("ctrl_regs.csv", "CTRL_MODE,0,1,2,3,x,rw,0,y\n"); },
+         [&] {
+             return file("ctrl_regs.csv") +
+                    ":19: register CTRL_MODE holds bits 2 to 3 of word 0x0 twice (also on line "
+                    "3): a value written does not read back\n";
+         },
+         12},
+        {"registers spanning more than one burst",
+         [&] { append("gpio_regs.csv", "FAR,1ffff,0,0,3,x,rw,0,y\n"); },
+         [&] {
+             return file("gpio_regs.csv") +
+                    ":8: registers span words 0x0 (line 2) to 0x1ffff (line 8): 131072 words, "
+                    "more than one burst moves (131071), so a read of every register fails\n";
+         },
+         12},
         {"setting of a register the register file lacks",
          [&] { replace("ctrl_params.csv", "CTRL_LOOPBACK=1", "CTRL_LOOP=1"); },
          [&] {

@@ -4,6 +4,7 @@
 #include <gtest/gtest.h>
 
 #include <filesystem>
+#include <fstream>
 #include <functional>
 #include <string>
 #include <vector>
@@ -327,6 +328,23 @@ std::vector<Fault> faults() {
          {{LINE, "Unable to parse file: {dir}ctrl_regs.csv line:3: CTRL_MODE,0,0,1\n"},
           {ABORT, ABORT_TEXT}},
          [](T& t) { EXPECT_FALSE(t.registered(1, 0)); }},
+        {"register file spanning more than one burst",
+         [](T& t) {
+             std::ofstream(t.data.path("ctrl_regs.csv"), std::ios::app)
+                 << "FAR,1ffff,0,0,3,far away,rw,0,y\n";
+             t.ok(t.initialize(1, 0));
+         },
+         [](T& t) { return t.getRegisters(1, 0, {}); },
+         ORVNEBU_FAILED,
+         {{ERR,
+           "Registers of {dir}ctrl_regs.csv span words 0x0 to 0x1FFFF (131072 words): "
+           "more than one burst moves (131071)"}},
+         [](T& t) {
+             EXPECT_TRUE(t.caller().empty());
+             // Registers of a narrower span are read as ever.
+             EXPECT_EQ(t.getRegisters(1, 0, {{"CTRL_MODE", ""}, {"FAR", ""}}), ORVNEBU_FAILED);
+             EXPECT_EQ(t.getRegisters(1, 0, {{"CTRL_MODE", ""}}), ORVNEBU_OK);
+         }},
         {"parameter file missing",
          [](T& t) { std::filesystem::remove(t.data.path("ctrl_params.csv")); },
          [](T& t) { return t.initialize(1, 0); },
