@@ -55,6 +55,16 @@ void OrvNebu_CsvText::splitCommas(const std::string& line, std::vector<std::stri
     fields.resize(count);
 }
 
+std::string OrvNebu_CsvText::hexText(uint32_t value) {
+    static const char* const DIGITS = "0123456789abcdef";
+    std::string text;
+    do {
+        text.insert(text.begin(), DIGITS[value & 0xFu]);
+        value >>= 4;
+    } while (value != 0);
+    return text;
+}
+
 bool OrvNebu_CsvText::hasInnerCR(const std::string& line) {
     const size_t cr = line.find('\r');
     return cr != std::string::npos && cr + 1 < line.size();

@@ -13,6 +13,10 @@ public:
     // Splits at every comma; adjacent commas give empty fields. Reuses fields' storage.
     static void splitCommas(const std::string& line, std::vector<std::string>& fields);
 
+    // Lower-case hexadecimal digits without prefix or leading zeros ("0" for zero), as the
+    // readers write addresses and slave types.
+    static std::string hexText(uint32_t value);
+
     // A carriage return before the end of the line: a file whose lines end in CR alone, read
     // as one line.
     static bool hasInnerCR(const std::string& line);

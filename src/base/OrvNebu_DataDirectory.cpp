@@ -8,6 +8,7 @@
 #include <set>
 #include <utility>
 
+#include "base/OrvNebu_CsvText.h"
 #include "host/OrvUtil.h"
 
 namespace OrvRT {
@@ -17,14 +18,7 @@ namespace {
 typedef OrvNebu_SlaveClassTable Classes;
 
 std::string typeText(int32_t type) {
-    static const char* const DIGITS = "0123456789abcdef";
-    uint32_t value = static_cast<uint32_t>(type);
-    std::string text;
-    do {
-        text.insert(text.begin(), DIGITS[value & 0xFu]);
-        value >>= 4;
-    } while (value != 0);
-    return "0x" + text;
+    return "0x" + OrvNebu_CsvText::hexText(static_cast<uint32_t>(type));
 }
 
 // Bits needed by a hexadecimal value text (as the reader converts the binary digits).

@@ -16,14 +16,7 @@ const char* const KEY_COLUMNS[] = {"slave_type", "orv_drv_ver_min", "orv_drv_ver
 const char* const BYTE_ORDER_MARK = "\xEF\xBB\xBF";
 
 std::string typeText(int32_t type) {
-    static const char* const DIGITS = "0123456789abcdef";
-    uint32_t value = static_cast<uint32_t>(type);
-    std::string text;
-    do {
-        text.insert(text.begin(), DIGITS[value & 0xFu]);
-        value >>= 4;
-    } while (value != 0);
-    return "0x" + text;
+    return "0x" + OrvNebu_CsvText::hexText(static_cast<uint32_t>(type));
 }
 
 }  // namespace

@@ -13,16 +13,6 @@ namespace OrvRT {
 
 namespace {
 
-std::string hexText(uint32_t value) {
-    static const char* const DIGITS = "0123456789abcdef";
-    std::string text;
-    do {
-        text.insert(text.begin(), DIGITS[value & 0xFu]);
-        value >>= 4;
-    } while (value != 0);
-    return text;
-}
-
 std::string bitRange(uint32_t low, uint32_t high) {
     return low == high ? "bit " + std::to_string(low)
                        : "bits " + std::to_string(low) + " to " + std::to_string(high);
@@ -232,7 +222,7 @@ void OrvNebu_RegisterFile::checkSlices() {
     for (const RegisterSlice& s : lines_) {
         if (!s.included) continue;
         const std::string where =
-            bitRange(s.lowBit(), s.highBit()) + " of word 0x" + hexText(s.address);
+            bitRange(s.lowBit(), s.highBit()) + " of word 0x" + OrvNebu_CsvText::hexText(s.address);
         if (s.registerName.empty())
             warn(s.line, 1, "slice without a register name: no call can reach it");
         if (s.highBit() >= BUS_WORD_BITS) {
@@ -245,7 +235,8 @@ void OrvNebu_RegisterFile::checkSlices() {
         for (const Placed& other : placed) {
             const uint32_t common = mask & other.mask;
             if (common == 0) continue;
-            const std::string shared = maskRange(common) + " of word 0x" + hexText(s.address);
+            const std::string shared =
+                maskRange(common) + " of word 0x" + OrvNebu_CsvText::hexText(s.address);
             if (other.slice->registerName == s.registerName) {
                 if (s.registerName.empty()) continue;
                 // One register holding a bit twice: a write sets it from two digits, a read
@@ -279,11 +270,11 @@ void OrvNebu_RegisterFile::checkSpan() {
         if (s.address > high) high = s.address, highSlice = &s;
         if (high >= low && high - low >= MAX_BURST_WORDS) {
             warn(s.line, 2,
-                 "registers span words 0x" + hexText(low) + " (line " +
-                     std::to_string(lowSlice->line) + ") to 0x" + hexText(high) + " (line " +
-                     std::to_string(highSlice->line) + "): " + std::to_string(high - low + 1) +
-                     " words, more than one burst moves (" + std::to_string(MAX_BURST_WORDS) +
-                     "), so a read of every register fails");
+                 "registers span words 0x" + OrvNebu_CsvText::hexText(low) + " (line " +
+                     std::to_string(lowSlice->line) + ") to 0x" + OrvNebu_CsvText::hexText(high) +
+                     " (line " + std::to_string(highSlice->line) + "): " +
+                     std::to_string(high - low + 1) + " words, more than one burst moves (" +
+                     std::to_string(MAX_BURST_WORDS) + "), so a read of every register fails");
             return;
         }
     }
@@ -302,9 +293,9 @@ void OrvNebu_RegisterFile::print(std::ostream& out) const {
         if (!s.included) continue;
         out << s.registerName << ',';
         if (s.address >= 10 && s.address <= 15) out << '0';
-        out << hexText(s.address) << ',' << s.order << ',' << s.startBit << ',' << s.endBit << ','
-            << s.text6 << ',' << (s.readable ? "r" : "") << (s.writable ? "w" : "") << ','
-            << s.text8 << ",y" << s.trailer << '\n'
+        out << OrvNebu_CsvText::hexText(s.address) << ',' << s.order << ',' << s.startBit << ','
+            << s.endBit << ',' << s.text6 << ',' << (s.readable ? "r" : "")
+            << (s.writable ? "w" : "") << ',' << s.text8 << ",y" << s.trailer << '\n'
             << std::flush;
     }
 }
