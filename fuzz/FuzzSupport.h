@@ -113,7 +113,8 @@ void checkBothReadings(const std::string& path) {
     }
     for (const OrvRT::OrvNebu_FileProblem& p : tools.problems()) {
         NEBU_FUZZ_CHECK(p.file == path && !p.text.empty());
-        NEBU_FUZZ_CHECK((p.severity == OrvRT::OrvNebu_FileProblem::WARNING) == !p.refusesFile());
+        NEBU_FUZZ_CHECK((p.severity == OrvRT::OrvNebu_FileProblem::SEVERITY_WARNING) ==
+                        !p.refusesFile());
     }
 }
 

@@ -140,7 +140,7 @@ void OrvNebu_DataDirectory::checkSettings(const OrvNebu_RegisterFile& registers,
                 problems_.push_back({params.path(),
                                      choice.line,
                                      setting.column,
-                                     OrvNebu_FileProblem::WARNING,
+                                     OrvNebu_FileProblem::SEVERITY_WARNING,
                                      text,
                                      {}});
             }
@@ -183,7 +183,8 @@ void OrvNebu_DataDirectory::checkTransceiverNeeds(const Row& row,
 }
 
 void OrvNebu_DataDirectory::add(const Row& row, const std::string& text) {
-    problems_.push_back({directory_.path(), row.line, 0, OrvNebu_FileProblem::WARNING, text, {}});
+    problems_.push_back(
+        {directory_.path(), row.line, 0, OrvNebu_FileProblem::SEVERITY_WARNING, text, {}});
 }
 
 std::vector<Classes::SlaveClass> OrvNebu_DataDirectory::classesOf(const Row& row) {

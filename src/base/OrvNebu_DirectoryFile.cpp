@@ -28,8 +28,12 @@ OrvNebu_DirectoryFile::OrvNebu_DirectoryFile(const std::string& path, Reading re
     // A directory in the file's place opens, but reading it fails.
     if (!in.is_open() || (!std::getline(in, line) && in.bad())) {
         const std::string text = "Unable to open " + path_;
-        problems_.push_back(
-            {path_, 0, 0, OrvNebu_FileProblem::ERROR, text, {{OrvNebu_FileProblem::ERROR, text}}});
+        problems_.push_back({path_,
+                             0,
+                             0,
+                             OrvNebu_FileProblem::SEVERITY_ERROR,
+                             text,
+                             {{OrvNebu_FileProblem::SEVERITY_ERROR, text}}});
         return;
     }
     readHeader(line, reading);
@@ -172,7 +176,7 @@ void OrvNebu_DirectoryFile::fillEntry(const Row& row, Orv_HashMapCStr& entry) co
 }
 
 void OrvNebu_DirectoryFile::warn(uint32_t line, uint32_t column, const std::string& text) {
-    problems_.push_back({path_, line, column, OrvNebu_FileProblem::WARNING, text, {}});
+    problems_.push_back({path_, line, column, OrvNebu_FileProblem::SEVERITY_WARNING, text, {}});
 }
 
 void OrvNebu_DirectoryFile::refuse(uint32_t line, const std::string& message,
@@ -180,9 +184,9 @@ void OrvNebu_DirectoryFile::refuse(uint32_t line, const std::string& message,
     problems_.push_back({path_,
                          line,
                          0,
-                         OrvNebu_FileProblem::ERROR,
+                         OrvNebu_FileProblem::SEVERITY_ERROR,
                          message + ": " + detail,
-                         {{OrvNebu_FileProblem::ERROR, message}}});
+                         {{OrvNebu_FileProblem::SEVERITY_ERROR, message}}});
 }
 
 }  // namespace OrvRT

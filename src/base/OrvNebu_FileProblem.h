@@ -10,9 +10,9 @@ namespace OrvRT {
 
 struct OrvNebu_FileProblem {
     // The plug-in reads on: the file is used as written, which may not be what was meant.
-    static constexpr uint32_t WARNING = 0;
-    static constexpr uint32_t ERROR = 256;
-    static constexpr uint32_t MALFORMED_LINE = 512;
+    static constexpr uint32_t SEVERITY_WARNING = 0;
+    static constexpr uint32_t SEVERITY_ERROR = 256;
+    static constexpr uint32_t SEVERITY_MALFORMED_LINE = 512;
 
     struct Message {
         uint32_t severity;
@@ -22,7 +22,7 @@ struct OrvNebu_FileProblem {
     std::string file;
     uint32_t line = 0;    // 1 is the first line; 0 the file as a whole
     uint32_t column = 0;  // 1 is the first column of the line; 0 when not known
-    uint32_t severity = WARNING;
+    uint32_t severity = SEVERITY_WARNING;
     std::string text;  // the problem, for a person
     // What the plug-in sends, in order, when it refuses the file here; empty for a warning.
     std::vector<Message> messages;

@@ -65,8 +65,12 @@ OrvNebu_ParamFile::OrvNebu_ParamFile(const std::string& path, Reading reading) :
         parameters_.clear();
         problems_.clear();
         const std::string text = "Unable to open OrvNebu parameter file: " + path_;
-        problems_.push_back(
-            {path_, 0, 0, OrvNebu_FileProblem::ERROR, text, {{OrvNebu_FileProblem::ERROR, text}}});
+        problems_.push_back({path_,
+                             0,
+                             0,
+                             OrvNebu_FileProblem::SEVERITY_ERROR,
+                             text,
+                             {{OrvNebu_FileProblem::SEVERITY_ERROR, text}}});
     }
 }
 
@@ -90,7 +94,7 @@ bool OrvNebu_ParamFile::parseLine(uint32_t lineNumber, const std::string& line) 
     OrvNebu_CsvText::splitCommas(line, fields);
     Orv_Util::unQuote(fields);
     if (fields.size() < 4) {
-        refuseLine(lineNumber, line, 0, OrvNebu_FileProblem::MALFORMED_LINE,
+        refuseLine(lineNumber, line, 0, OrvNebu_FileProblem::SEVERITY_MALFORMED_LINE,
                    "row of " + std::to_string(fields.size()) +
                        (fields.size() == 1 ? " field" : " fields") +
                        ": a row needs 4 (parameter, choice index, choice, settings)");
@@ -103,7 +107,7 @@ bool OrvNebu_ParamFile::parseLine(uint32_t lineNumber, const std::string& line) 
     if (parameters_.empty() || name != parameters_.back().name) {
         if (parameters_.empty() && name.empty()) {
             // An empty name on the first row: there is no parameter to take the choice.
-            refuseLine(lineNumber, line, 1, OrvNebu_FileProblem::MALFORMED_LINE,
+            refuseLine(lineNumber, line, 1, OrvNebu_FileProblem::SEVERITY_MALFORMED_LINE,
                        "row without a parameter name");
             return false;
         }
@@ -111,7 +115,7 @@ bool OrvNebu_ParamFile::parseLine(uint32_t lineNumber, const std::string& line) 
     }
     Parameter& parameter = parameters_.back();
     if (readChoiceIndex(fields[1]) != parameter.choices.size()) {
-        refuseLine(lineNumber, line, 2, OrvNebu_FileProblem::ERROR, INDEX_OUT_OF_ORDER);
+        refuseLine(lineNumber, line, 2, OrvNebu_FileProblem::SEVERITY_ERROR, INDEX_OUT_OF_ORDER);
         dropRefusedRows();
         return false;
     }
@@ -133,7 +137,7 @@ bool OrvNebu_ParamFile::parseSettings(uint32_t lineNumber, const std::string& li
         const size_t eq = setting.find('=');
         const std::string bits = eq == std::string::npos ? std::string() : setting.substr(eq + 1);
         if (setting.size() < 3 || eq == std::string::npos || exceedsUint32(bits.size())) {
-            refuseLine(lineNumber, line, column, OrvNebu_FileProblem::MALFORMED_LINE,
+            refuseLine(lineNumber, line, column, OrvNebu_FileProblem::SEVERITY_MALFORMED_LINE,
                        "setting " + setting + " is not of the form REGISTER=bits");
             return false;
         }
@@ -142,7 +146,7 @@ bool OrvNebu_ParamFile::parseSettings(uint32_t lineNumber, const std::string& li
         try {
             Orv_NumberUtil::binStr2HexStr(bits, parsed.value);
         } catch (const std::exception& e) {
-            refuseLine(lineNumber, line, column, OrvNebu_FileProblem::ERROR, e.what());
+            refuseLine(lineNumber, line, column, OrvNebu_FileProblem::SEVERITY_ERROR, e.what());
             return false;
         }
         choice.settings.push_back(std::move(parsed));
@@ -153,9 +157,10 @@ bool OrvNebu_ParamFile::parseSettings(uint32_t lineNumber, const std::string& li
 void OrvNebu_ParamFile::refuseLine(uint32_t lineNumber, const std::string& line, uint32_t column,
                                    uint32_t severity, const std::string& text) {
     OrvNebu_FileProblem problem{path_, lineNumber, column, severity, text, {}};
-    if (severity == OrvNebu_FileProblem::ERROR) problem.messages.push_back({severity, text});
+    if (severity == OrvNebu_FileProblem::SEVERITY_ERROR)
+        problem.messages.push_back({severity, text});
     problem.messages.push_back(
-        {OrvNebu_FileProblem::MALFORMED_LINE,
+        {OrvNebu_FileProblem::SEVERITY_MALFORMED_LINE,
          "Unable to parse file: " + path_ + " line:" + std::to_string(lineNumber) + ": " + line});
     problems_.push_back(std::move(problem));
 }
@@ -197,7 +202,7 @@ void OrvNebu_ParamFile::checkFirstLine(const std::string& line) {
 }
 
 void OrvNebu_ParamFile::warn(uint32_t line, const std::string& text) {
-    problems_.push_back({path_, line, 0, OrvNebu_FileProblem::WARNING, text, {}});
+    problems_.push_back({path_, line, 0, OrvNebu_FileProblem::SEVERITY_WARNING, text, {}});
 }
 
 void OrvNebu_ParamFile::print(std::ostream& out) const {

@@ -81,8 +81,12 @@ OrvNebu_RegisterFile::OrvNebu_RegisterFile(const std::string& path, Reading read
         maxAddress_ = 0;
         problems_.clear();
         const std::string text = "Unable to open OrvNebu register file: " + path_;
-        problems_.push_back(
-            {path_, 0, 0, OrvNebu_FileProblem::ERROR, text, {{OrvNebu_FileProblem::ERROR, text}}});
+        problems_.push_back({path_,
+                             0,
+                             0,
+                             OrvNebu_FileProblem::SEVERITY_ERROR,
+                             text,
+                             {{OrvNebu_FileProblem::SEVERITY_ERROR, text}}});
         return;
     }
     if (reading == EVERY_PROBLEM) {
@@ -115,7 +119,7 @@ bool OrvNebu_RegisterFile::parseLine(uint32_t lineNumber, const std::string& lin
     std::vector<std::string>& cols = columns_;
     OrvNebu_CsvText::splitCommas(line, cols);
     if (cols.size() < MIN_COLUMNS) {
-        refuseLine(lineNumber, line, 0, OrvNebu_FileProblem::MALFORMED_LINE,
+        refuseLine(lineNumber, line, 0, OrvNebu_FileProblem::SEVERITY_MALFORMED_LINE,
                    (line.empty() ? std::string("empty line")
                                  : "line of " + std::to_string(cols.size()) + " columns") +
                        ": a register line needs 9 columns");
@@ -127,7 +131,7 @@ bool OrvNebu_RegisterFile::parseLine(uint32_t lineNumber, const std::string& lin
     try {
         slice.address = Orv_NumberUtil::hexStr2UInt(cols[1]);
     } catch (const std::exception& e) {
-        refuseLine(lineNumber, line, 2, OrvNebu_FileProblem::ERROR, e.what());
+        refuseLine(lineNumber, line, 2, OrvNebu_FileProblem::SEVERITY_ERROR, e.what());
         return false;
     }
     slice.order = static_cast<uint32_t>(OrvNebu_CsvText::decimalToInt32(cols[2]));
@@ -138,12 +142,13 @@ bool OrvNebu_RegisterFile::parseLine(uint32_t lineNumber, const std::string& lin
     // excluded line is not looked at.
     if (slice.included && (slice.startBit > HIGHEST_WORD_BIT || slice.endBit > HIGHEST_WORD_BIT)) {
         refuseLine(
-            lineNumber, line, slice.startBit > HIGHEST_WORD_BIT ? 4 : 5, OrvNebu_FileProblem::ERROR,
+            lineNumber, line, slice.startBit > HIGHEST_WORD_BIT ? 4 : 5,
+            OrvNebu_FileProblem::SEVERITY_ERROR,
             "Register bit out of range 0 to 31: start bit " + cols[3] + ", end bit " + cols[4]);
         return false;
     }
     if (slice.included && slice.address > MAX_BUS_ADDRESS) {
-        refuseLine(lineNumber, line, 2, OrvNebu_FileProblem::ERROR,
+        refuseLine(lineNumber, line, 2, OrvNebu_FileProblem::SEVERITY_ERROR,
                    "Register address out of range 0 to 1ffff: " + cols[1]);
         return false;
     }
@@ -181,15 +186,16 @@ void OrvNebu_RegisterFile::addSlice(RegisterSlice&& slice) {
 void OrvNebu_RegisterFile::refuseLine(uint32_t lineNumber, const std::string& line, uint32_t column,
                                       uint32_t severity, const std::string& text) {
     OrvNebu_FileProblem problem{path_, lineNumber, column, severity, text, {}};
-    if (severity == OrvNebu_FileProblem::ERROR) problem.messages.push_back({severity, text});
-    problem.messages.push_back({OrvNebu_FileProblem::MALFORMED_LINE,
+    if (severity == OrvNebu_FileProblem::SEVERITY_ERROR)
+        problem.messages.push_back({severity, text});
+    problem.messages.push_back({OrvNebu_FileProblem::SEVERITY_MALFORMED_LINE,
                                 "Unable to parse file: " + path_ +
                                     " line:" + std::to_string(lineNumber) + ": " + line + "\n"});
     problems_.push_back(std::move(problem));
 }
 
 void OrvNebu_RegisterFile::warn(uint32_t line, uint32_t column, const std::string& text) {
-    problems_.push_back({path_, line, column, OrvNebu_FileProblem::WARNING, text, {}});
+    problems_.push_back({path_, line, column, OrvNebu_FileProblem::SEVERITY_WARNING, text, {}});
 }
 
 void OrvNebu_RegisterFile::checkFirstLine(const std::string& line) {
@@ -266,8 +272,14 @@ void OrvNebu_RegisterFile::checkSpan() {
     const RegisterSlice* highSlice = nullptr;
     for (const RegisterSlice& s : lines_) {
         if (!s.included) continue;
-        if (s.address < low) low = s.address, lowSlice = &s;
-        if (s.address > high) high = s.address, highSlice = &s;
+        if (s.address < low) {
+            low = s.address;
+            lowSlice = &s;
+        }
+        if (s.address > high) {
+            high = s.address;
+            highSlice = &s;
+        }
         if (high >= low && high - low >= MAX_BURST_WORDS) {
             warn(s.line, 2,
                  "registers span words 0x" + OrvNebu_CsvText::hexText(low) + " (line " +

@@ -18,9 +18,6 @@ namespace OrvRT {
 class OrvNebu_RegisterHandler {
 public:
     static constexpr uint32_t SEVERITY_ERROR = 256;
-    static constexpr uint32_t SEVERITY_MALFORMED_LINE = 512;
-    static constexpr uint32_t MAX_BUS_ADDRESS = OrvNebu_RegisterFile::MAX_BUS_ADDRESS;
-    static constexpr uint32_t HIGHEST_WORD_BIT = OrvNebu_RegisterFile::HIGHEST_WORD_BIT;
 
     typedef OrvNebu_RegisterFile::RegisterSlice RegisterSlice;
     typedef OrvNebu_RegisterFile::Register Register;

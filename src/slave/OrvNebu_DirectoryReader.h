@@ -11,8 +11,6 @@ namespace OrvRT {
 
 class OrvNebu_DirectoryReader {
 public:
-    static constexpr uint32_t SEVERITY_ERROR = 256;
-
     // Fills entry from the first line matching the slave type and driver version, under the
     // header's (lower-case, trimmed) column names. True when a line matched. A file that
     // cannot be opened or whose header is unusable is reported, then Orv_AbortException.

@@ -97,9 +97,9 @@ TEST(RegisterFile, LinesKeepTheirNumbersExcludedOnesTooAndReadingGoesOn) {
     const OrvNebu_FileProblem& p = file.problems()[0];
     EXPECT_EQ(p.line, 4u);
     EXPECT_EQ(p.column, 2u);
-    EXPECT_EQ(p.severity, OrvNebu_FileProblem::ERROR);
+    EXPECT_EQ(p.severity, OrvNebu_FileProblem::SEVERITY_ERROR);
     ASSERT_EQ(p.messages.size(), 2u);
-    EXPECT_EQ(p.messages[1].severity, OrvNebu_FileProblem::MALFORMED_LINE);
+    EXPECT_EQ(p.messages[1].severity, OrvNebu_FileProblem::SEVERITY_MALFORMED_LINE);
 
     // The plug-in's reading stops there.
     const OrvNebu_RegisterFile plugin(dir.path("r.csv"));

@@ -58,7 +58,8 @@ void printProblem(const OrvNebu_FileProblem& p, std::ostream& out) {
     if (p.line != 0) out << ':' << p.line;
     out << ": " << p.text;
     // The plug-in quotes the line it stops at.
-    if (p.refusesFile() && p.messages.back().severity == OrvNebu_FileProblem::MALFORMED_LINE) {
+    if (p.refusesFile() &&
+        p.messages.back().severity == OrvNebu_FileProblem::SEVERITY_MALFORMED_LINE) {
         out << " (the plug-in refuses the file)";
     }
     out << '\n';
