@@ -4,5 +4,5 @@
 set -euo pipefail
 root=$(cd "$(dirname "$0")/../.." && pwd)
 "$root/scripts/bootstrap" python3 ninja-build git ccache lld
-exec python3 "$root/scripts/mutate" --sample "${NEBU_MUTATE_SAMPLE:-300}" --seed 1 \
+exec python3 "$root/scripts/mutate" --sample "${NEBU_MUTATE_SAMPLE:-150}" --seed 1 \
   --floor "$root/scripts/mutate.floor" --report "$root/build-mutate/sample-report.txt"
