@@ -1,5 +1,5 @@
-// The stand-in host's JTAG-session library: the target lock, session messages and the
-// listener registry with the end of a session.
+// The stand-in host's JTAG-session library: the target lock and the listener registry with
+// the end of a session.
 #include <algorithm>
 #include <deque>
 #include <future>
@@ -69,21 +69,6 @@ TEST_F(OrvJtagTest, TheSameCallerTakesTheLockAgainAnotherThreadTimesOut) {
     }
     // Released as often as taken: free for the other thread again.
     EXPECT_EQ(lockFromOtherThread(HANDLE, 60000), "");
-}
-
-TEST_F(OrvJtagTest, MessagesReachTheSinkWithHandleSeverityAndText) {
-    OrvJtag_session_sendMessage(3, 256, "first\nline");
-    OrvJtag_session_sendMessage(HANDLE, 32768, nullptr);
-    const auto all = messages();
-    ASSERT_EQ(all.size(), 2u);
-    EXPECT_EQ(all[0].handle, 3u);
-    EXPECT_EQ(all[0].severity, 256u);
-    EXPECT_EQ(all[0].text, "first\nline");
-    EXPECT_LAST_MESSAGE(SEVERITY_ABORT, "");
-    EXPECT_EQ(lastMessage().handle, HANDLE);
-    OrvSim::setMessageSink(nullptr);  // dropped without a sink
-    OrvJtag_session_sendMessage(HANDLE, 256, "lost");
-    EXPECT_FALSE(hasMessage(256, "lost"));
 }
 
 TEST_F(OrvJtagTest, ListenersRegisterOnceAndHearOfEverySessionEnd) {
