@@ -63,27 +63,24 @@ class Report {
 public:
     // line 0: the file as a whole.
     void add(const std::string& file, uint32_t line, const std::string& text) {
-        problems_.push_back(Problem{file, line, text, problems_.size()});
+        problems_.push_back(Problem{{file, line, text}, problems_.size()});
     }
-    size_t count() const { return problems_.size(); }
-    void print(std::ostream& out) {
+    // Sorted by file and line, in the order found within a line.
+    std::vector<LintProblem> take() {
         std::sort(problems_.begin(), problems_.end(), [](const Problem& a, const Problem& b) {
-            if (a.file != b.file) return a.file < b.file;
-            if (a.line != b.line) return a.line < b.line;
+            if (a.problem.file != b.problem.file) return a.problem.file < b.problem.file;
+            if (a.problem.line != b.problem.line) return a.problem.line < b.problem.line;
             return a.sequence < b.sequence;
         });
-        for (const Problem& p : problems_) {
-            out << p.file;
-            if (p.line != 0) out << ':' << p.line;
-            out << ": " << p.text << '\n';
-        }
+        std::vector<LintProblem> sorted;
+        for (Problem& p : problems_) sorted.push_back(std::move(p.problem));
+        problems_.clear();
+        return sorted;
     }
 
 private:
     struct Problem {
-        std::string file;
-        uint32_t line;
-        std::string text;
+        LintProblem problem;
         size_t sequence;
     };
     std::vector<Problem> problems_;
@@ -408,14 +405,7 @@ const TransceiverRecord TRANSCEIVER_RECORDS[] = {
     {0x43, 1, 1, r3QraNeeds}, {0x44, 1, 1, m3QrcNeeds},      {0x45, 1, 1, r3QrbNeeds},
 };
 
-struct DirectoryLine {
-    uint32_t line;
-    int32_t slaveType;
-    int32_t minVersion;
-    int32_t maxVersion;
-    std::string registers;   // as the line gives it
-    std::string parameters;  // as the line gives it; may be empty
-};
+using DirectoryLine = LintDirectoryLine;
 
 bool isDirectory(const std::string& path) {
     std::error_code error;
@@ -434,14 +424,15 @@ public:
     Linter(const std::string& dataDir, Report& report)
         : dataDir_(dataDir), directoryFile_(dataDir + DIRECTORY_FILE), report_(report) {}
 
-    void run() {
+    // The lines that reach the key columns.
+    std::vector<DirectoryLine> run() {
         std::vector<DirectoryLine> lines;
-        if (!readDirectory(lines)) return;
+        if (!readDirectory(lines)) return lines;
         checkOverlaps(lines);
         for (const DirectoryLine& d : lines) checkFiles(d);
+        return lines;
     }
 
-    size_t directoryLines() const { return directoryLineCount_; }
     size_t filesRead() const {
         size_t n = 0;
         for (const auto& f : registerFiles_) n += f.second != nullptr ? 1 : 0;
@@ -516,7 +507,6 @@ private:
                 }
                 continue;
             }
-            ++directoryLineCount_;
             DirectoryLine d;
             d.line = lineNumber;
             d.slaveType = OrvNebu_CsvText::autoBaseToInt32(fields[static_cast<size_t>(typeColumn)]);
@@ -648,13 +638,26 @@ private:
     std::string directoryFile_;
     Report& report_;
     MessageLog log_;
-    size_t directoryLineCount_ = 0;
     std::map<std::string, std::unique_ptr<RegisterFileCheck>> registerFiles_;
     std::map<std::string, std::unique_ptr<ParamFileCheck>> paramFiles_;
     std::set<std::string> settingsChecked_;
 };
 
 }  // namespace
+
+LintResult lintDataDir(const std::string& dataDir) {
+    Report report;
+    LintResult result;
+    {
+        Linter linter(dataDir, report);
+        result.directoryLines = linter.run();
+        result.filesRead = linter.filesRead();
+    }
+    // The parameter reader keeps lint's files cached under its session until it ends.
+    OrvSim::endSession(LINT_SESSION);
+    result.problems = report.take();
+    return result;
+}
 
 int runLint(const std::vector<std::string>& args, const std::string& defaultDataDir,
             std::ostream& out, std::ostream& err) {
@@ -685,16 +688,15 @@ int runLint(const std::vector<std::string>& args, const std::string& defaultData
     }
     if (dataDir.back() != '/') dataDir += '/';
 
-    Report report;
-    Linter linter(dataDir, report);
-    linter.run();
-    // The parameter reader keeps lint's files cached under its session until it ends.
-    OrvSim::endSession(LINT_SESSION);
-
-    report.print(out);
-    const size_t n = report.count();
-    out << "lint " << dataDir << ": " << linter.directoryLines() << " directory lines, "
-        << linter.filesRead() << " definition files, ";
+    const LintResult result = lintDataDir(dataDir);
+    for (const LintProblem& p : result.problems) {
+        out << p.file;
+        if (p.line != 0) out << ':' << p.line;
+        out << ": " << p.text << '\n';
+    }
+    const size_t n = result.problems.size();
+    out << "lint " << dataDir << ": " << result.directoryLines.size() << " directory lines, "
+        << result.filesRead << " definition files, ";
     if (n == 0) {
         out << "no problems" << std::endl;
         return 0;
