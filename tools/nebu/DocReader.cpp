@@ -160,7 +160,7 @@ class MessageLog {
 public:
     MessageLog() {
         OrvSim::setMessageSink([this](uint32_t handle, uint32_t, const std::string& text) {
-            if (handle == DOC_SESSION) last_ = text;
+            if (handle == DOC_SESSION && first_.empty()) first_ = text;
         });
     }
     ~MessageLog() { OrvSim::setMessageSink(nullptr); }
@@ -168,12 +168,12 @@ public:
     MessageLog& operator=(const MessageLog&) = delete;
     std::string take() {
         std::string text;
-        text.swap(last_);
+        text.swap(first_);
         return text;
     }
 
 private:
-    std::string last_;
+    std::string first_;  // the first since take(): the reader's own words
 };
 
 const char* const DEFAULT_CLASS = "default slave";

@@ -44,10 +44,17 @@ th, td { border: 1px solid var(--line); padding: 3px 8px; text-align: left; vert
 thead th { background: var(--soft); font-weight: 600; }
 tbody tr:nth-child(even) td { background: #fafbfc; }
 td.num { white-space: nowrap; }
+table.dir td:nth-child(5), table.dir td:nth-child(6) { white-space: nowrap; }
+table.dir td:nth-child(4) { min-width: 14em; }
+table.dir .flag { display: block; font-size: 13px; }
+table.dir tr.fault-text .flag { display: inline; }
 tr.excluded td { color: var(--muted); font-style: italic; }
 tr.free td { color: var(--muted); }
-tr.claimed td, tr.fault td { border-left: 4px double var(--fault); }
-tr.fault td:first-child, tr.claimed td:first-child { border-left-width: 6px; }
+tr.claimed td:first-child, tr.fault td:first-child, tr.fault-text td {
+  border-left: 6px double var(--fault); }
+tr.fault td { border-bottom: 0; }
+tbody tr.fault td, tbody tr.fault-text td { background: #fbf3f3; }
+tr.fault-text td { border-top: 0; padding-left: 14px; }
 .flag { font-weight: 700; color: var(--fault); }
 section.problems { border: 2px solid var(--fault); border-left-width: 8px; padding: 4px 14px;
   margin: 14px 0; }
@@ -151,8 +158,8 @@ size_t problemCount(const Site& site, const std::string& path) {
 std::string fileLink(const std::string& page, const std::string& name, size_t problems) {
     std::string html = "<a href=\"" + esc(page) + "\"><code>" + esc(name) + "</code></a>";
     if (problems != 0) {
-        html += " <span class=\"flag\">(" + std::to_string(problems) +
-                (problems == 1 ? " problem)" : " problems)") + "</span>";
+        html += " <span class=\"flag\">" + std::to_string(problems) +
+                (problems == 1 ? " problem" : " problems") + "</span>";
     }
     return html;
 }
@@ -162,8 +169,10 @@ std::string classText(const DirectoryRow& row) {
     if (row.classes.size() == 1) return esc(row.classes.front().className);
     std::string text;
     for (const ClassSpan& span : row.classes) {
-        if (!text.empty()) text += "; ";
-        text += esc(span.className) + " (versions " + versionText(span.minVersion) +
+        if (!text.empty()) text += "<br>";
+        text += esc(span.className) +
+                (span.minVersion == span.maxVersion ? " (version " : " (versions ") +
+                versionText(span.minVersion) +
                 (span.minVersion == span.maxVersion ? "" : " to " + versionText(span.maxVersion)) +
                 ")";
     }
@@ -200,9 +209,11 @@ std::string indexPage(const Site& site) {
             "scope=\"col\">Parameter file</th><th scope=\"col\">Lint</th></tr></thead>\n<tbody>\n";
     for (const DirectoryRow& row : site.rows) {
         std::string faults;
+        size_t count = 0;
         for (const Problem& p : site.problems) {
             if (p.file == site.directoryPath && p.line == row.line) {
                 faults += "<div><span class=\"flag\">problem:</span> " + esc(p.text) + "</div>";
+                ++count;
             }
         }
         const auto file = [&](int index, const std::string& name, bool registers) -> std::string {
@@ -220,7 +231,13 @@ std::string indexPage(const Site& site) {
                 versionText(row.minVersion) + " to " + versionText(row.maxVersion) + "</td><td>" +
                 classText(row) + "</td><td>" + file(row.registerIndex, row.registerFile, true) +
                 "</td><td>" + file(row.parameterIndex, row.parameterFile, false) + "</td><td>" +
-                (faults.empty() ? "ok" : faults) + "</td></tr>\n";
+                (count == 0 ? std::string("ok")
+                            : "<span class=\"flag\">" + std::to_string(count) +
+                                  (count == 1 ? " problem" : " problems") + "</span>") +
+                "</td></tr>\n";
+        // The problems under their row, across the table, so that long paths fit.
+        if (count != 0)
+            html += "<tr class=\"fault-text\"><td colspan=\"7\">" + faults + "</td></tr>\n";
     }
     html += "</tbody>\n</table>\n<h2>Files</h2>\n<ul class=\"files\">\n";
     for (const RegisterFile& f : site.registerFiles) {

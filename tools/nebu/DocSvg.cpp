@@ -460,11 +460,15 @@ private:
                    bits + "\"><title>bits " + bits + " " +
                    (run.conflict ? "claimed by " : "read by ") + esc(ownerNames(run.owners)) +
                    "</title><rect class=\"" + word + "\" x=\"" + num(x) + "\" y=\"" + num(y) +
-                   "\" width=\"" + num(w) + "\" height=\"" + num(CLAIM_ROW - 4) +
-                   "\"/><rect class=\"tag\" x=\"" + num(x + w / 2 - 30) + "\" y=\"" + num(y + 4) +
-                   "\" width=\"60\" height=\"15\" rx=\"2\"/><text class=\"tagtext\" "
-                   "text-anchor=\"middle\" x=\"" +
-                   num(x + w / 2) + "\" y=\"" + num(y + 15) + "\">" + word + "</text></g>";
+                   "\" width=\"" + num(w) + "\" height=\"" + num(CLAIM_ROW - 4) + "\"/>";
+            // A one-bit run has no room for its word: the pattern and the table tell it.
+            if (w >= 64) {
+                svg += "<rect class=\"tag\" x=\"" + num(x + w / 2 - 30) + "\" y=\"" + num(y + 4) +
+                       "\" width=\"60\" height=\"15\" rx=\"2\"/><text class=\"tagtext\" "
+                       "text-anchor=\"middle\" x=\"" +
+                       num(x + w / 2) + "\" y=\"" + num(y + 15) + "\">" + word + "</text>";
+            }
+            svg += "</g>";
         }
     }
 
