@@ -47,9 +47,10 @@ public:
     static std::string& uLL2DecStr(uint64_t value, std::string& out);
     static std::string& uInt2DecStr(uint32_t value, std::string& out);
     // Exactly width '0'/'1' digits, most significant first: the low width bits of the value,
-    // any width. Returns out.
+    // any width. Throws std::logic_error for text that is not hexadecimal, empty or blank text
+    // included. Returns out.
     static std::string& hexStr2BinStr(const std::string& hex, uint32_t width, std::string& out);
-    // ceil(n/4) upper-case hex digits, zero padded. Returns out.
+    // ceil(n/4) upper-case hex digits, zero padded; "0" for no bits. Returns out.
     static std::string& binStr2HexStr(const std::string& bits, std::string& out);
 };
 

@@ -117,6 +117,8 @@ std::string& Orv_NumberUtil::hexStr2BinStr(const std::string& hex, uint32_t widt
                                "\" is larger than " + std::to_string(MAX_WIDTH) + " bits.");
     }
     const auto [begin, end] = hexDigits(hex);
+    // A register value must name its bits: empty text is no number, unlike a 0 digit.
+    if (begin == end) badHex(hex);
     // Built aside so that a failure leaves out untouched.
     std::string bits(width, '0');
     // Bit b of the value is bit b%4 of the digit b/4 places from the end.
@@ -139,7 +141,8 @@ std::string& Orv_NumberUtil::binStr2HexStr(const std::string& bits, std::string&
         }
     }
     const size_t n = bits.size();
-    const size_t digits = n / 4u + (n % 4u != 0 ? 1u : 0u);
+    // No bits is the value 0, which still has a digit.
+    const size_t digits = n == 0 ? 1u : n / 4u + (n % 4u != 0 ? 1u : 0u);
     std::string hex(digits, '0');
     // Bit b counts from the least significant end, the last character.
     for (size_t d = 0; d < digits; ++d) {

@@ -25,6 +25,8 @@ const char* const MSG_INVALID_BURST_LENGTH =
     "Invalid burst length (Word Count > Maximum Burst Length 131071).\n";
 const char* const MSG_INVALID_ADDRESS =
     "Invalid bus address (Address > Maximum Address 0x1FFFF).\n";
+const char* const MSG_INVALID_BURST_END =
+    "Invalid burst end address (Address + Word Count - 1 > Maximum Address 0x1FFFF).\n";
 const char* const KEY_DCLK_HAS_RESET = "dclk_has_reset";
 
 // Bursts up to this many words run on stack buffers; longer ones allocate once.
@@ -187,6 +189,16 @@ void OrvNebu_PivoTransaction::checkBurstCount(uint32_t count) const {
     if (count > MAX_BURST_WORDS) throw std::logic_error(MSG_INVALID_BURST_LENGTH);
 }
 
+void OrvNebu_PivoTransaction::checkBurstEnd(uint32_t address, uint32_t incrAddress,
+                                            uint32_t count) const {
+    // The master's address wraps to 0 after the last one: such a burst reaches words the
+    // caller never named.
+    if (incrAddress != 0 && count != 0 &&
+        static_cast<uint64_t>(address) + count - 1u > MAX_ADDRESS) {
+        throw std::logic_error(MSG_INVALID_BURST_END);
+    }
+}
+
 void OrvNebu_PivoTransaction::deliverStatus(uint32_t handle, const ORV_SLAVE_REF& slaveRef,
                                             uint32_t* status) {
     if (status == nullptr) return;
@@ -237,6 +249,7 @@ void OrvNebu_PivoTransaction::burstSlaveRead(uint32_t handle, ORV_SLAVE_REF slav
                                              uint32_t* buffer, uint32_t numRead, uint32_t* status) {
     checkTransfer(slaveRef, address);
     checkBurstCount(numRead);
+    checkBurstEnd(address, incrAddress, numRead);
     writeTransferControl(handle, numRead, true, incrAddress != 0, false, slaveRef.slaveIndex);
     writeAddress(handle, false, address);
     readBurstData(handle, buffer, numRead);
@@ -249,6 +262,7 @@ void OrvNebu_PivoTransaction::burstSlaveWrite(uint32_t handle, ORV_SLAVE_REF sla
                                               uint32_t* status) {
     checkTransfer(slaveRef, address);
     checkBurstCount(numWrite);
+    checkBurstEnd(address, incrAddress, numWrite);
     writeTransferControl(handle, numWrite, true, incrAddress != 0, false, slaveRef.slaveIndex);
     writeAddress(handle, true, address);
     writeBurstData(handle, buffer, numWrite);

@@ -105,6 +105,8 @@ private:
     // Refuses what the master cannot carry out as asked; nothing has been sent yet.
     void checkTransfer(const ORV_SLAVE_REF& slaveRef, uint32_t address) const;
     void checkBurstCount(uint32_t count) const;
+    // Refuses a burst whose incrementing address would run past the last bus address.
+    void checkBurstEnd(uint32_t address, uint32_t incrAddress, uint32_t count) const;
     void deliverStatus(uint32_t handle, const ORV_SLAVE_REF& slaveRef, uint32_t* status);
     uint32_t runCommand(uint32_t handle, uint32_t cmd, const uint8_t* dataIn, uint8_t* dataOut,
                         uint32_t bitCount);

@@ -11,7 +11,10 @@ void OrvNebu_ParamChoice::toCSVFile(std::ostream& out,
     out << choiceName_;
     std::string bits;
     for (const RegValue& setting : regValueList_) {
-        Orv_NumberUtil::hexStr2BinStr(setting.second, action.getRegWidth(setting.first), bits);
+        // A setting of no bits has no digits to convert.
+        const uint32_t width = action.getRegWidth(setting.first);
+        bits.clear();
+        if (width != 0) Orv_NumberUtil::hexStr2BinStr(setting.second, width, bits);
         out << ',' << setting.first << '=' << bits;
     }
 }

@@ -18,9 +18,10 @@ OrvNebu_DefaultRegisterHandler::OrvNebu_DefaultRegisterHandler(uint32_t handle,
 OrvNebu_DefaultRegisterHandler::~OrvNebu_DefaultRegisterHandler() = default;
 
 OrvNebu_RegisterHandler::Cache& OrvNebu_DefaultRegisterHandler::cache() {
-    // Never destroyed: handlers still held at unload stay where they are.
-    static Cache* instance = new Cache();
-    return *instance;
+    // Emptied at unload without deleting the handlers it still holds: the map holds plain
+    // pointers, and slaves the host never removed may still use them.
+    static Cache instance;
+    return instance;
 }
 
 OrvNebu_RegisterHandler* OrvNebu_DefaultRegisterHandler::getRegisterHandler(

@@ -18,9 +18,10 @@ OrvNebu_SingleRegisterHandler::OrvNebu_SingleRegisterHandler(uint32_t handle,
 OrvNebu_SingleRegisterHandler::~OrvNebu_SingleRegisterHandler() = default;
 
 OrvNebu_RegisterHandler::Cache& OrvNebu_SingleRegisterHandler::cache() {
-    // Never destroyed: handlers still held at unload stay where they are.
-    static Cache* instance = new Cache();
-    return *instance;
+    // Emptied at unload without deleting the handlers it still holds: the map holds plain
+    // pointers, and slaves the host never removed may still use them.
+    static Cache instance;
+    return instance;
 }
 
 OrvNebu_RegisterHandler* OrvNebu_SingleRegisterHandler::getRegisterHandler(

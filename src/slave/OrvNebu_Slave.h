@@ -15,7 +15,7 @@ class OrvNebu_Slave : public Orv_Core {
 public:
     static constexpr int32_t NOT_INITIALIZED_PREVIOUS_SLAVE_VALUE = 9999;
     // A bus has at most 255 slaves, so a walk along next_slave links that takes more steps
-    // than this has gone round a loop.
+    // than this has gone round a loop; the reference-clock questions stop there.
     static constexpr uint32_t MAX_CHAIN_STEPS = 255;
 
     OrvNebu_Slave(uint32_t handle, const ORV_SLAVE_REF& slaveRef, const ORV_CORE_INFO& coreInfo,

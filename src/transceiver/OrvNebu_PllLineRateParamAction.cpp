@@ -194,6 +194,11 @@ void OrvNebu_PllLineRateParamAction::calcTuneValues(double lineRate, uint64_t da
                                " is 0.");
     }
     const double sysclk = OrvNebu_XcvrNumber::readDouble(found->second);
+    // Windows of a clock that is no positive number would stop every measurement.
+    if (!(sysclk > 0.0) || std::isinf(sysclk)) {
+        throw std::logic_error(std::string("Cannot calculate new line rate tune values, since ") +
+                               SYSCLK_NAME + " '" + found->second + "' is not a positive number.");
+    }
     uint64_t rate = 0;
     if (lineRate >= RATE_LIMIT) {
         rate = UINT64_MAX;
@@ -239,13 +244,15 @@ bool OrvNebu_PllLineRateParamAction::readLineRateChoiceString(uint64_t& fb, uint
     for (char& c : copy) {
         if (c == ',' || c == '=') c = ' ';
     }
-    // The scan of LINE_RATE_CHOICE_READ_FORMAT: a number, then three times a skipped word and
-    // an unsigned number; strtoull saturates where the scan's overflow is undefined.
+    // The scan of LINE_RATE_CHOICE_READ_FORMAT: a number (decimal, as every number text of
+    // these parameters), then three times a skipped word and an unsigned number; strtoull
+    // saturates where the scan's overflow is undefined.
     const char* p = copy.c_str();
+    const char* rateEnd = nullptr;
+    const double rate = OrvNebu_XcvrNumber::readDecimal(p, &rateEnd);
+    if (rateEnd == p) return false;
+    p = rateEnd;
     char* end = nullptr;
-    const double rate = std::strtod(p, &end);
-    if (end == p) return false;
-    p = end;
     uint64_t values[3] = {0, 0, 0};
     for (uint64_t& value : values) {
         p = skipBlanks(p);

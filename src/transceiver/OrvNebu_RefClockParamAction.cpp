@@ -13,22 +13,34 @@ namespace {
 
 // The duals of this thread now passing a driver question on, per direction. next_slave links
 // that lead back to a dual already asked would pass the question round for ever; a dual that
-// meets its own question again answers the unknown source instead.
-thread_local std::vector<const void*> askingSouth;
-thread_local std::vector<const void*> askingNorth;
+// meets its own question again answers the unknown source instead. Plain arrays: a
+// thread_local with a destructor would keep the plug-in loaded after the host unloads it.
+struct AskingList {
+    const void* slaves[OrvNebu_Slave::MAX_CHAIN_STEPS];
+    uint32_t count;
+};
+thread_local AskingList askingSouth;
+thread_local AskingList askingNorth;
 
 class AskingGuard {
 public:
-    AskingGuard(std::vector<const void*>& list, const void* slave) : list_(list) {
-        list_.push_back(slave);
+    AskingGuard(AskingList& list, const void* slave) : list_(list) {
+        list_.slaves[list_.count++] = slave;
     }
-    ~AskingGuard() { list_.pop_back(); }
+    ~AskingGuard() { --list_.count; }
     AskingGuard(const AskingGuard&) = delete;
     AskingGuard& operator=(const AskingGuard&) = delete;
 
 private:
-    std::vector<const void*>& list_;
+    AskingList& list_;
 };
+
+// Whether slave is passing the question on already, or the walk has taken as many steps as
+// a bus has slaves (it can only have gone round a loop then).
+bool alreadyAsking(const AskingList& list, const void* slave) {
+    if (list.count >= OrvNebu_Slave::MAX_CHAIN_STEPS) return true;
+    return std::find(list.slaves, list.slaves + list.count, slave) != list.slaves + list.count;
+}
 
 }  // namespace
 
@@ -78,8 +90,8 @@ std::string OrvNebu_RefClockParamAction::driverAnswer(bool south, Orv_HashMapCSt
         std::string name;
         return OrvNebu_VanduR2Qra::makeLocationName(registers, name);
     }
-    std::vector<const void*>& asking = south ? askingSouth : askingNorth;
-    if (std::find(asking.begin(), asking.end(), slave_) != asking.end()) return UNKNOWN_SOURCE;
+    AskingList& asking = south ? askingSouth : askingNorth;
+    if (alreadyAsking(asking, slave_)) return UNKNOWN_SOURCE;
     AskingGuard guard(asking, slave_);
     return askNeighbour(south);
 }

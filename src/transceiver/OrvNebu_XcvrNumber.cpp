@@ -1,6 +1,7 @@
 // Number reading and formatting shared by the transceiver actions.
 #include "transceiver/OrvNebu_XcvrNumber.h"
 
+#include <cctype>
 #include <cinttypes>
 #include <cstdio>
 #include <cstdlib>
@@ -8,8 +9,42 @@
 
 namespace OrvRT {
 
+namespace {
+bool isDigit(char c) { return c >= '0' && c <= '9'; }
+bool isBlank(char c) { return std::isspace(static_cast<unsigned char>(c)) != 0; }
+}  // namespace
+
 double OrvNebu_XcvrNumber::readDouble(const std::string& text) {
-    return std::strtod(text.c_str(), nullptr);
+    const char* end = nullptr;
+    return readDecimal(text.c_str(), &end);
+}
+
+double OrvNebu_XcvrNumber::readDecimal(const char* text, const char** end) {
+    // strtod alone would also take hexadecimal numbers, nan and inf: only the decimal form
+    // is cut out here and handed to it.
+    const char* p = text;
+    while (isBlank(*p)) ++p;
+    const char* start = p;
+    if (*p == '+' || *p == '-') ++p;
+    size_t digits = 0;
+    for (; isDigit(*p); ++p) ++digits;
+    if (*p == '.') {
+        for (++p; isDigit(*p); ++p) ++digits;
+    }
+    if (digits == 0) {
+        *end = text;
+        return 0.0;
+    }
+    if (*p == 'e' || *p == 'E') {
+        const char* q = p + 1;
+        if (*q == '+' || *q == '-') ++q;
+        if (isDigit(*q)) {
+            while (isDigit(*q)) ++q;
+            p = q;
+        }
+    }
+    *end = p;
+    return std::strtod(std::string(start, p).c_str(), nullptr);
 }
 
 int64_t OrvNebu_XcvrNumber::readLld(const std::string& text) {

@@ -9,8 +9,12 @@ namespace OrvRT {
 
 class OrvNebu_XcvrNumber {
 public:
-    // The leading decimal floating-point number of the text, 0 when there is none.
+    // The leading decimal floating-point number of the text (blanks, sign, digits with a
+    // decimal point, exponent), 0 when there is none: hexadecimal, nan and inf texts read
+    // their leading decimal number, or 0. Too large a number reads as infinite.
     static double readDouble(const std::string& text);
+    // The same from a C text; end is set after the number, or to text when there is none.
+    static double readDecimal(const char* text, const char** end);
     // The leading signed decimal integer ("%lld" rules), 0 when there is none; saturates
     // instead of overflowing.
     static int64_t readLld(const std::string& text);

@@ -398,7 +398,8 @@ TEST_F(ConsoleTest, DumpInitializesOnlyWhatThisConsoleHasNotInitialized) {
     EXPECT_EQ(g_calls,
               (std::vector<std::string>{
                   "h1 initialize 0,1,0", "h1 getRegisters 0,1,0",
-                  "h1 getParameters 0,1,0 refclk_freq=125",
+                  // inputs go with every parameter the slave names for an empty request
+                  "h1 getParameters 0,1,0", "h1 getParameters 0,1,0 line_rate= refclk_freq=125",
                   // second dump: no initialize
                   "h1 getRegisters 0,1,0", "h1 getParameters 0,1,0", "h1 initialize 0,1,1",
                   "h1 getRegisters 0,1,1", "h1 getParameters 0,1,1", "h1 terminate 0,1,0",

@@ -141,7 +141,7 @@ TEST_F(ParamReader, LineEndingsQuotesAndEmptyFields) {
     EXPECT_TRUE(a.getChoiceList()[1].getRegValueList().empty());
     // EN= is three characters: accepted, width 0 (the first width of EN, 1, stays).
     ASSERT_EQ(1u, a.getChoiceList()[2].getRegValueList().size());
-    EXPECT_EQ("", a.getChoiceList()[2].getRegValueList()[0].second);
+    EXPECT_EQ("0", a.getChoiceList()[2].getRegValueList()[0].second);
     EXPECT_EQ(1u, a.getRegWidth("EN"));
 
     // A comma inside quotes still splits: "On,Fast" becomes two fields.

@@ -203,6 +203,18 @@ TEST_F(RegisterCacheTest, OneHandlerPerFileSharedUntilTheLastSlaveGoes) {
     EXPECT_EQ(mapOf(fresh)["NEW"], "0BAD");
 }
 
+TEST_F(RegisterCacheTest, ASlaveWhoseFileFailsGivesBackOnlyItsOwnReference) {
+    const std::string file = data_.path("regs.csv");
+    ASSERT_EQ(initialize(0), ORVNEBU_OK);
+    EXPECT_EQ(initialize(6), ORVNEBU_FAILED);  // missing.csv: counted, then given back
+    EXPECT_EQ(OrvNebu_DefaultRegisterHandler::getHandlerCount(), 1u);
+    EXPECT_NE(OrvNebu_DefaultRegisterHandler::findRegisterHandler(HANDLE, file), nullptr);
+    poke(0, 2, 0x0A0B);
+    ORV_HASHMAP_HANDLE live = makeMap({{"A", ""}});
+    ASSERT_EQ(getRegs(0, live), ORVNEBU_OK);
+    EXPECT_EQ(mapOf(live)["A"], "0A0B");
+}
+
 TEST_F(RegisterCacheTest, PrintingAndLookupsCountNothing) {
     const std::string file = data_.path("regs.csv");
     std::ostringstream out;

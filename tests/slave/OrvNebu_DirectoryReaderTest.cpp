@@ -1,8 +1,16 @@
 // The directory file: header rules, number bases of the key columns, first match wins, and
 // each failure with its messages as OrvNebu_initialize reports them.
+#include <memory>
+#include <typeinfo>
+
+#include "slave/OrvNebu_DefaultSlave.h"
 #include "slave/OrvNebu_DirectoryReader.h"
 #include "slave/OrvNebu_SlaveFactory.h"
 #include "support/RegsFixture.h"
+#include "transceiver/OrvNebu_VanduM3Qrc.h"
+#include "transceiver/OrvNebu_VanduR2Qra.h"
+#include "transceiver/OrvNebu_VanduR3Qra.h"
+#include "transceiver/OrvNebu_VanduR3Qrb.h"
 
 using OrvRT::Orv_HashMapCStr;
 using OrvRT::OrvNebu_DirectoryReader;
@@ -140,24 +148,65 @@ TEST_F(DirectoryReaderTest, RegisterFileNameKeepsItsBlanks) {
     EXPECT_MESSAGE(256, "Unable to open OrvNebu register file: " + data_.dir() + " regs.csv");
 }
 
-TEST(SlaveFactoryRecords, FourteenRecordsSortedWithTheirVersionRanges) {
+// The class of the slave a creation function builds from the demo files of that class.
+class SlaveFactoryRecords : public TestHost {
+protected:
+    std::string built(OrvNebu_SlaveFactory::CreateFunction create, const std::string& files) {
+        const std::string base = std::string(NEBU_TEST_DATA_DIR) + "/" + files;
+        std::unique_ptr<OrvRT::OrvNebu_Slave> slave(
+            create(HANDLE, ORV_CORE_INFO{{1, 0, 0, 0, 0}}, ORV_SLAVE_REF{0, 1, 0},
+                   Orv_HashMapCStr(), base + "_regs.csv", base + "_params.csv"));
+        return slave ? typeid(*slave).name() : "<none>";
+    }
+};
+
+TEST_F(SlaveFactoryRecords, FourteenRecordsSortedWithTheirVersionRangesAndClasses) {
+    const std::string plain = typeid(OrvRT::OrvNebu_DefaultSlave).name();
+    const std::string m3qrc = typeid(OrvRT::OrvNebu_VanduM3Qrc).name();
+    const std::string r2qra = typeid(OrvRT::OrvNebu_VanduR2Qra).name();
+    const std::string r3qra = typeid(OrvRT::OrvNebu_VanduR3Qra).name();
+    const std::string r3qrb = typeid(OrvRT::OrvNebu_VanduR3Qrb).name();
+    const struct {
+        int32_t type, min, max;
+        std::string cls;
+        const char* files;  // demo files the class can read
+    } expected[14] = {{0x00, 0, 0xFFFF, plain, "ctrl"},        {0x01, 1, 1, m3qrc, "vandu_m3qrc"},
+                      {0x11, 1, 0xFFFF, plain, "ctrl"},        {0x12, 1, 0xFFFF, plain, "ctrl"},
+                      {0x13, 1, 0xFFFF, plain, "ctrl"},        {0x14, 1, 0xFFFF, plain, "ctrl"},
+                      {0x15, 1, 0xFFFF, r3qra, "vandu_r3qra"}, {0x21, 1, 0xFFFF, plain, "ctrl"},
+                      {0x31, 1, 0xFFFF, plain, "ctrl"},        {0x41, 1, 1, plain, "ctrl"},
+                      {0x42, 1, 1, r2qra, "vandu_r2qra"},      {0x43, 1, 1, r3qra, "vandu_r3qra"},
+                      {0x44, 1, 1, m3qrc, "vandu_m3qrc"},      {0x45, 1, 1, r3qrb, "vandu_r3qrb"}};
     size_t count = 0;
     const OrvNebu_SlaveFactory::CreationRecord* r = OrvNebu_SlaveFactory::records(count);
     ASSERT_EQ(count, 14u);
-    const int32_t expected[14][3] = {{0x00, 0, 0xFFFF}, {0x01, 1, 1},      {0x11, 1, 0xFFFF},
-                                     {0x12, 1, 0xFFFF}, {0x13, 1, 0xFFFF}, {0x14, 1, 0xFFFF},
-                                     {0x15, 1, 0xFFFF}, {0x21, 1, 0xFFFF}, {0x31, 1, 0xFFFF},
-                                     {0x41, 1, 1},      {0x42, 1, 1},      {0x43, 1, 1},
-                                     {0x44, 1, 1},      {0x45, 1, 1}};
     for (size_t i = 0; i < count; ++i) {
-        EXPECT_EQ(r[i].slaveType, expected[i][0]) << i;
-        EXPECT_EQ(r[i].minDriverVersion, expected[i][1]) << i;
-        EXPECT_EQ(r[i].maxDriverVersion, expected[i][2]) << i;
-        EXPECT_NE(r[i].create, nullptr);
+        EXPECT_EQ(r[i].slaveType, expected[i].type) << i;
+        EXPECT_EQ(r[i].minDriverVersion, expected[i].min) << i;
+        EXPECT_EQ(r[i].maxDriverVersion, expected[i].max) << i;
+        EXPECT_EQ(built(r[i].create, expected[i].files), expected[i].cls) << i;
         // Every record is found for its own range, and only for it.
         EXPECT_EQ(OrvNebu_SlaveFactory::findCreateFunction(r[i].slaveType, r[i].minDriverVersion),
                   r[i].create);
+        EXPECT_EQ(OrvNebu_SlaveFactory::findCreateFunction(r[i].slaveType, r[i].maxDriverVersion),
+                  r[i].create);
     }
+    // Outside every record the default slave is built, whatever files come with it.
+    const struct {
+        int32_t type, version;
+        const char* files;
+    } uncovered[] = {{0x44, 2, "vandu_m3qrc"},
+                     {0x42, 2, "vandu_r2qra"},
+                     {0x01, 0, "vandu_m3qrc"},
+                     {0x41, 2, "ctrl"},
+                     {0x99, 1, "ctrl"}};
+    for (const auto& u : uncovered) {
+        EXPECT_EQ(built(OrvNebu_SlaveFactory::findCreateFunction(u.type, u.version), u.files),
+                  plain)
+            << u.type << " " << u.version;
+    }
+    EXPECT_EQ(built(OrvNebu_SlaveFactory::findCreateFunction(0x15, 7), "vandu_r3qra"), r3qra);
+    EXPECT_TRUE(noMessages());
 }
 
 }  // namespace

@@ -323,11 +323,20 @@ TEST_F(R3QraDual, CurrentRateIsAFifthWhenOversampling) {
     action->getRegsToRead(registers);
     EXPECT_EQ(5u, registers.size());
     EXPECT_EQ(1u, registers.count("TX_OVERSAMPLE_MODE"));
-    slave.memory["TX_OVERSAMPLE_MODE"] = "1";
-    slave.getRegisters(1, slave.getSlaveRef(), &registers);
-    Orv_HashMapCStr params{{"refclk_freq", "125"}};
-    action->readRegsAndUpdateParams(false, registers, params);
-    EXPECT_EQ("500.000 FB=2, REF=1, DIVSEL=1", params["line_rate"]);
+    // The register text is hexadecimal, for the current rate as for the choices: A is on.
+    for (const char* mode : {"1", "A", "0"}) {
+        slave.memory["TX_OVERSAMPLE_MODE"] = mode;
+        slave.getRegisters(1, slave.getSlaveRef(), &registers);
+        Orv_HashMapCStr params{{"refclk_freq", "125"}};
+        action->readRegsAndUpdateParams(false, registers, params);
+        const bool on = mode[0] != '0';
+        EXPECT_EQ(on ? "500.000 FB=2, REF=1, DIVSEL=1" : "2500.000 FB=2, REF=1, DIVSEL=1",
+                  params["line_rate"])
+            << mode;
+        EXPECT_EQ(on ? "250.000 FB=2, REF=1, DIVSEL=2" : "1250.000 FB=2, REF=1, DIVSEL=2",
+                  choices("125").at(on ? 2 : 1))
+            << mode;
+    }
 }
 
 TEST_F(R3QraDual, SettingCopiesTransmitDividersToReceiveAndDoublesWideWindows) {

@@ -169,9 +169,15 @@ void Console::cmdDump(const Words& args) {
     print("registers: " + formatRc(regRc));
     printMap(registers.map(), "  ");
 
+    // An empty request asks for every parameter; inputs are added to that full request, not
+    // put in its place, so the names of every parameter are asked for first.
     HostMap params;
-    params.addWords(args, 3);
-    const uint32_t paramRc = api_.getParameters(session_, ref, params.address());
+    uint32_t paramRc = api_.getParameters(session_, ref, params.address());
+    if (paramRc == ORVNEBU_OK && args.size() > 3) {
+        for (auto& entry : params.map()) entry.second.clear();
+        params.addWords(args, 3);
+        paramRc = api_.getParameters(session_, ref, params.address());
+    }
     if (paramRc != ORVNEBU_OK) failed_ = true;
     print("parameters: " + formatRc(paramRc));
     printMap(params.map(), "  ");

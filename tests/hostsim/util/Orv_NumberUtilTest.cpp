@@ -93,7 +93,6 @@ TEST(Orv_NumberUtilTest, HexToBinaryGivesExactlyTheWidthAtAnyWidth) {
     EXPECT_EQ(Orv_NumberUtil::hexStr2BinStr("ab", 8, out), "10101011");
     EXPECT_EQ(Orv_NumberUtil::hexStr2BinStr("AB", 8, out), "10101011");
     EXPECT_EQ(Orv_NumberUtil::hexStr2BinStr("  0x5 ", 4, out), "0101");
-    EXPECT_EQ(Orv_NumberUtil::hexStr2BinStr("", 3, out), "000");
     EXPECT_EQ(Orv_NumberUtil::hexStr2BinStr("FFFFFFFFFFFFFFFF", 64, out), std::string(64, '1'));
     EXPECT_EQ(Orv_NumberUtil::hexStr2BinStr("8000000000000001", 64, out),
               "1" + std::string(62, '0') + "1");
@@ -108,11 +107,14 @@ TEST(Orv_NumberUtilTest, HexToBinaryGivesExactlyTheWidthAtAnyWidth) {
 
 TEST(Orv_NumberUtilTest, HexToBinaryRejectsBadTextAndLeavesTheOutput) {
     std::string out = "kept";
-    for (const char* bad : {"xyz", "G1", "1 1", "0x"}) {
+    // Empty or blank text is no number either, at any width.
+    for (const char* bad : {"xyz", "G1", "1 1", "0x", "", " ", "\t"}) {
         const std::string what = logicErrorOf([&] { Orv_NumberUtil::hexStr2BinStr(bad, 4, out); });
         EXPECT_NE(what.find(std::string("\"") + bad + "\""), std::string::npos) << what;
         EXPECT_EQ(out, "kept");
     }
+    EXPECT_THROW(Orv_NumberUtil::hexStr2BinStr("", 0, out), std::logic_error);
+    EXPECT_EQ(out, "kept");
     // An absurd width is refused instead of allocating gigabytes.
     const std::string what =
         logicErrorOf([&] { Orv_NumberUtil::hexStr2BinStr("1", UINT32_MAX, out); });
@@ -122,8 +124,9 @@ TEST(Orv_NumberUtilTest, HexToBinaryRejectsBadTextAndLeavesTheOutput) {
 
 TEST(Orv_NumberUtilTest, BinaryToHexPadsToTheFullWidthAtAnyWidth) {
     std::string out = "stale";
+    // No bits is the value 0: a number the other way round.
     EXPECT_EQ(&Orv_NumberUtil::binStr2HexStr("", out), &out);
-    EXPECT_EQ(out, "");
+    EXPECT_EQ(out, "0");
     EXPECT_EQ(Orv_NumberUtil::binStr2HexStr("1", out), "1");
     EXPECT_EQ(Orv_NumberUtil::binStr2HexStr("0000", out), "0");
     EXPECT_EQ(Orv_NumberUtil::binStr2HexStr("00000", out), "00");
