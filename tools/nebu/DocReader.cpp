@@ -179,10 +179,10 @@ private:
 const char* const DEFAULT_CLASS = "default slave";
 
 std::string className(OrvNebu_SlaveFactory::CreateFunction create) {
-    if (create == &OrvRT::OrvNebu_VanduM3Qrc::create) return "M3Qrc transceiver dual";
-    if (create == &OrvRT::OrvNebu_VanduR2Qra::create) return "R2Qra transceiver dual";
-    if (create == &OrvRT::OrvNebu_VanduR3Qra::create) return "R3Qra transceiver dual";
-    if (create == &OrvRT::OrvNebu_VanduR3Qrb::create) return "R3Qrb transceiver quad";
+    if (create == &OrvRT::OrvNebu_VanduM3Qrc::create) return "M3Qrc transceiver";
+    if (create == &OrvRT::OrvNebu_VanduR2Qra::create) return "R2Qra transceiver";
+    if (create == &OrvRT::OrvNebu_VanduR3Qra::create) return "R3Qra transceiver";
+    if (create == &OrvRT::OrvNebu_VanduR3Qrb::create) return "R3Qrb transceiver";
     return DEFAULT_CLASS;
 }
 
