@@ -77,6 +77,7 @@ svg.defs { position: absolute; }
 .box { fill: #dde6f1; stroke: var(--ink); stroke-width: 1.5; }
 .box.rev { fill: url(#p-rev); }
 .box.beyond { fill: url(#p-beyond); stroke-dasharray: 5 3; }
+.box.idle { fill: #fff; stroke: #8c959f; stroke-width: 1; }
 .free { fill: #fff; stroke: #9aa3ad; stroke-width: 1; stroke-dasharray: 3 3; }
 .free.beyond { fill: url(#p-beyond); }
 .conflict { fill: url(#p-conflict); stroke: var(--ink); stroke-width: 1.5; }
@@ -420,8 +421,9 @@ std::string parameterSection(const RegisterFile* registers, const Parameter& par
                                   "tbl-" + pid) +
                     "<figcaption>Word <code>" + wordText(address) + "</code> of <code>" +
                     esc(registers->name) +
-                    "</code>: its boxes, then the bits each choice writes (dark: 1, light: "
-                    "0; empty: left as they are).</figcaption></figure>\n";
+                    "</code>: its boxes (filled: the registers the parameter sets), then the "
+                    "bits each choice writes (dark: 1, light: 0; empty: left as they "
+                    "are).</figcaption></figure>\n";
         }
     }
     return html + "</section>\n";

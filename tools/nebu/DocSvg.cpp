@@ -6,6 +6,7 @@
 #include <cstddef>
 #include <set>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "DocHtml.h"
@@ -182,6 +183,7 @@ public:
         assignLanes();
     }
 
+    void setTouched(std::set<std::string> names) { touched_ = std::move(names); }
     int width() const { return left_ + 16 * COL + PAD; }
     bool upperShown() const { return upperShown_; }
 
@@ -373,7 +375,11 @@ private:
         const int w = static_cast<int>(p.high - p.low + 1) * COL - 4;
         const int top = y + 2;
         const int h = laneHeight - 4;
-        const char* kind = p.band == 1 ? "box beyond" : s.reversed() ? "box rev" : "box";
+        const bool idle = !touched_.empty() && touched_.count(s.registerName) == 0;
+        const char* kind = idle           ? "box idle"
+                           : p.band == 1  ? "box beyond"
+                           : s.reversed() ? "box rev"
+                                          : "box";
         svg += "<a href=\"" + esc(link(s)) + "\"><g class=\"slice\" data-line=\"" +
                std::to_string(s.line) + "\" data-register=\"" + esc(s.registerName) +
                "\" data-word=\"" + wordText(s.address) + "\" data-bits=\"" +
@@ -486,6 +492,8 @@ private:
     uint32_t address_;
     int left_;
     std::string linkPage_;
+    // When not empty, the registers whose boxes stand out; the others are drawn idle.
+    std::set<std::string> touched_;
     std::vector<std::vector<size_t>> claims_;  // per word bit: the slices on it
     std::vector<Piece> pieces_;
     bool upperShown_ = false;
@@ -578,7 +586,12 @@ std::string wordTable(const RegisterFile& file, uint32_t address, const std::str
 
 std::string choicePicture(const RegisterFile& file, uint32_t address, const Parameter& parameter,
                           const std::string& title, const std::string& describedBy) {
-    const WordLayout layout(file, address, CHOICE_LABEL, true, file.page);
+    WordLayout layout(file, address, CHOICE_LABEL, true, file.page);
+    std::set<std::string> touched;
+    for (const Choice& choice : parameter.choices) {
+        for (const Setting& setting : choice.settings) touched.insert(setting.registerName);
+    }
+    layout.setTouched(touched);
     std::string body;
     int y = layout.drawBand(body, 0, PAD, false);
     const int rowsTop = y + 4;
