@@ -145,6 +145,12 @@ TEST_F(DocTest, DemoSiteDrawsEveryRegisterLine) {
             << "bit " << bit.first;
     }
     EXPECT_EQ(params.find("data-choice=\"custom\""), std::string::npos);
+    // mode leaves CTRL_CLK_DIV alone: its box is drawn idle in mode's picture.
+    const size_t mode = params.find("id=\"pic-mode-word-0x0000\"");
+    ASSERT_NE(mode, std::string::npos);
+    EXPECT_EQ(
+        params.find("<rect class=\"box idle\"", mode),
+        params.find("<rect class=\"box", params.find("data-register=\"CTRL_CLK_DIV\"", mode)));
 
     // The classes the factory makes, and what a transceiver class computes from which register.
     EXPECT_NE(index.find("<td class=\"num\">0x15</td><td class=\"num\">1 to 0xffff</td><td>R3Qra "
