@@ -80,8 +80,9 @@ struct Parameter {
 
 // A parameter a slave class computes instead of taking it from the parameter file.
 struct ComputedParameter {
-    std::vector<std::string> names;      // the names it answers to
-    std::vector<std::string> registers;  // what it reads
+    std::vector<std::string> names;             // the names it answers to
+    std::vector<std::string> registers;         // what it reads (or writes)
+    std::vector<std::string> choiceParameters;  // of the parameter file, that it works through
 };
 
 // The slave class the factory makes for some directory rows naming the parameter file.

@@ -429,6 +429,19 @@ std::string parameterSection(const RegisterFile* registers, const Parameter& par
     return html + "</section>\n";
 }
 
+// Names in code, each linked to hrefPrefix + its id part when hrefPrefix is not empty.
+std::string codeList(const std::vector<std::string>& names, const std::string& hrefPrefix) {
+    std::string text;
+    for (const std::string& n : names) {
+        const std::string code = "<code>" + esc(n) + "</code>";
+        text += (text.empty() ? "" : ", ") +
+                (hrefPrefix.empty()
+                     ? code
+                     : "<a href=\"" + esc(hrefPrefix) + idPart(n) + "\">" + code + "</a>");
+    }
+    return text;
+}
+
 std::string computedSection(const Site& site, const ParameterFile& file) {
     if (file.classes.empty()) return "";
     const RegisterFile* registers =
@@ -443,26 +456,24 @@ std::string computedSection(const Site& site, const ParameterFile& file) {
             html += "<p class=\"notice\">" + esc(use.problem) + "</p>\n";
             continue;
         }
+        bool throughChoices = false;
+        for (const ComputedParameter& c : use.computed) {
+            throughChoices = throughChoices || !c.choiceParameters.empty();
+        }
         html +=
             "<table class=\"computed\">\n<caption>Parameters the class adds to those of the "
             "file, and the registers each reads</caption>\n<thead><tr><th "
-            "scope=\"col\">Parameters</th><th scope=\"col\">Reads registers</th></tr></thead>"
-            "\n<tbody>\n";
+            "scope=\"col\">Parameters</th><th scope=\"col\">Registers</th>" +
+            std::string(throughChoices ? "<th scope=\"col\">Through choice parameters</th>" : "") +
+            "</tr></thead>\n<tbody>\n";
+        const std::string regLinks = registers != nullptr ? registers->page + "#reg-" : "";
         for (const ComputedParameter& c : use.computed) {
-            std::string names;
-            for (const std::string& n : c.names) {
-                names += (names.empty() ? "" : ", ") + std::string("<code>") + esc(n) + "</code>";
-            }
-            std::string regs;
-            for (const std::string& r : c.registers) {
-                const std::string code = "<code>" + esc(r) + "</code>";
-                regs += (regs.empty() ? "" : ", ") +
-                        (registers != nullptr ? "<a href=\"" + esc(registers->page) + "#" +
-                                                    registerId(r) + "\">" + code + "</a>"
-                                              : code);
-            }
-            html += "<tr><td>" + names + "</td><td>" +
-                    (regs.empty() ? "none: a value the host passes in" : regs) + "</td></tr>\n";
+            const std::string regs = codeList(c.registers, regLinks);
+            html +=
+                "<tr><td>" + codeList(c.names, "") + "</td><td>" +
+                (regs.empty() ? "none: a value the host passes in" : regs) + "</td>" +
+                (throughChoices ? "<td>" + codeList(c.choiceParameters, "#param-") + "</td>" : "") +
+                "</tr>\n";
         }
         html += "</tbody>\n</table>\n";
     }
