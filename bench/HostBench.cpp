@@ -3,6 +3,9 @@
 #include <benchmark/benchmark.h>
 
 #include <cstdint>
+#if defined(__GLIBC__)
+#include <malloc.h>
+#endif
 
 #include "host/OrvCore.h"
 #include "host/OrvJtag.h"
@@ -78,6 +81,35 @@ void BM_CoreListLookup(benchmark::State& state) {
     OrvSim::resetHost();
 }
 BENCHMARK(BM_CoreListLookup);
+
+#if defined(__GLIBC__)
+size_t heapInUse() { return mallinfo2().uordblks; }
+
+// What the host keeps of a session after its end: each of state.range(0) sessions is used the
+// way the plug-in uses one (target lock, core list, a queued write and its flush), then ended.
+// bytesPerSession is the heap still in use afterwards, divided by the number of sessions.
+void BM_EndedSessionsMemory(benchmark::State& state) {
+    const auto sessions = static_cast<uint32_t>(state.range(0));
+    const ORV_SLAVE_REF ref{0, 1, 0};
+    double kept = 0;
+    for (auto _ : state) {
+        setUpHost();
+        const size_t before = heapInUse();
+        for (uint32_t handle = 1000; handle < 1000 + sessions; ++handle) {
+            OrvRT::OrvJtagTargetLock lock(handle, 60000);
+            benchmark::DoNotOptimize(OrvRT::Orv_CoreList::getSlave(handle, &ref));
+            const uint8_t bits[4] = {};
+            OrvCore_runCoreCommand(handle, 0, 1, 1, 4, bits, nullptr, 29, 0);
+            OrvJtag_target_flush(handle);
+        }
+        for (uint32_t handle = 1000; handle < 1000 + sessions; ++handle) OrvSim::endSession(handle);
+        kept = (static_cast<double>(heapInUse()) - static_cast<double>(before)) / sessions;
+    }
+    state.counters["bytesPerSession"] = kept;
+    OrvSim::resetHost();
+}
+BENCHMARK(BM_EndedSessionsMemory)->Arg(40000)->Iterations(1)->Unit(benchmark::kMillisecond);
+#endif
 
 }  // namespace
 

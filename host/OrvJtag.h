@@ -2,6 +2,7 @@
 #pragma once
 
 #include <cstdint>
+#include <memory>
 
 #include "host/OrvExport.h"
 
@@ -17,7 +18,8 @@ public:
     OrvJtagTargetLock& operator=(const OrvJtagTargetLock&) = delete;
 
 private:
-    uint32_t handle_;
+    // The session's target, kept while it is held even if the session ends meanwhile.
+    std::shared_ptr<void> target_;
 };
 
 // Receives the host's session notices. The host never deletes a listener.

@@ -5,6 +5,7 @@
 
 #include <cstdint>
 #include <functional>
+#include <map>
 #include <memory>
 #include <string>
 
@@ -42,13 +43,27 @@ struct JtagStats {
 // The session's counters since the previous call; resets them.
 ORV_JTAG_API JtagStats takeStats(uint32_t handle);
 
+// How a session's target lock was held since the previous call (which resets it), so that a
+// test sees every host operation of a call made under the lock with the right timeout.
+struct TargetLockUse {
+    std::map<uint32_t, uint64_t> takesByTimeout;  // OrvJtagTargetLock takes, by timeout (ms)
+    uint64_t callsHeld = 0;    // JTAG and core list operations made by the lock's holder
+    uint64_t callsUnheld = 0;  // the same made by a caller that did not hold the lock
+};
+ORV_JTAG_API TargetLockUse takeTargetLockUse(uint32_t handle);
+
+// addSessionMessageListener calls so far, each counted as it begins (before it waits for the
+// listener registry, which the host holds while it tells listeners of a session end).
+ORV_JTAG_API uint64_t listenerRegistrations();
+
 // The host's end of a session: every registered SessionMessageListener gets sessionEnded,
 // then the session's core list (and the cores in it) is dropped and its queued writes are
-// sent before the queue is dropped. Counters stay.
+// sent; then the host forgets the session, counters included. A later use of the handle
+// starts a new session.
 ORV_CORE_API void endSession(uint32_t handle);
 
-// Ends every session used so far, then forgets sinks, board, data directory and counters: a
-// fresh host, for tests. Listeners stay registered (they are process-wide plug-in objects).
+// Ends every session, then forgets listeners, sinks, board and data directory: a fresh host,
+// for tests. A plug-in has to register its listeners again, as with a new host process.
 ORV_CORE_API void resetHost();
 
 }  // namespace OrvSim

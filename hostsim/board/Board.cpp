@@ -82,6 +82,7 @@ std::shared_ptr<Board> Board::copy() const {
                 toCore.type = core.type;
                 toCore.hasRawStatus = core.hasRawStatus;
                 toCore.rawStatus = core.rawStatus;
+                toCore.failingCommands = core.failingCommands;
                 if (core.master) toCore.master = std::make_unique<BusMaster>(*core.master);
             }
         }
@@ -174,6 +175,24 @@ bool Board::runCommand(uint32_t device, uint32_t chain, uint32_t core, uint32_t 
         c->master->read(cmd, dataOut, bitCount);
     }
     return true;
+}
+
+bool Board::commandFails(uint32_t device, uint32_t chain, uint32_t core, uint32_t cmd) const {
+    std::lock_guard<std::mutex> lock(impl_->mutex);
+    const BoardCore* c = findCore(*impl_, device, chain, core);
+    return c != nullptr && cmd < 32 && ((c->failingCommands >> cmd) & 1u) != 0;
+}
+
+bool Board::hasFailingCommands() const {
+    std::lock_guard<std::mutex> lock(impl_->mutex);
+    for (const BoardDevice& device : impl_->devices) {
+        for (const auto& chain : device.chains) {
+            for (const BoardCore& core : chain.second.cores) {
+                if (core.failingCommands != 0) return true;
+            }
+        }
+    }
+    return false;
 }
 
 uint16_t Board::peek(uint32_t device, uint32_t chain, uint32_t slave, uint32_t address) const {

@@ -51,6 +51,11 @@ public:
     // core does not exist.
     bool runCommand(uint32_t device, uint32_t chain, uint32_t core, uint32_t cmd,
                     const uint8_t* dataIn, uint8_t* dataOut, uint32_t bitCount);
+    // Whether the host's command channel fails for that command to the core (a fault setting
+    // of the board file); false for a core that does not exist.
+    bool commandFails(uint32_t device, uint32_t chain, uint32_t core, uint32_t cmd) const;
+    // Whether any core has such a fault.
+    bool hasFailingCommands() const;
 
     // Direct access to a slave's memory on the chain's first bus master, no JTAG.
     // Throw std::out_of_range when there is no such master or slave.

@@ -19,6 +19,8 @@ struct BoardCore {
     // The `status` of the board file, replacing the computed status bits when present.
     bool hasRawStatus = false;
     std::vector<uint8_t> rawStatus;  // bit k = bit k%8 of byte k/8
+    // The `failingCommands` of the board file: bit c set when command c to the core fails.
+    uint32_t failingCommands = 0;
     std::unique_ptr<BusMaster> master;
 };
 

@@ -72,12 +72,88 @@ bool parseNumberText(const std::string& text, bool& negative, uint64_t& magnitud
     return true;
 }
 
+// The error of a board file: the file, the place in it (when there is one) and the problem.
+[[noreturn]] void failIn(const std::string& name, const std::string& path,
+                         const std::string& problem) {
+    throw BoardError(name + ": " + (path.empty() ? std::string() : path + ": ") + problem);
+}
+
+std::string at(const std::string& path, const std::string& key) {
+    return path.empty() ? key : path + "." + key;
+}
+
+// Watches the parser go by: refuses a key given twice in one object, which the parser would
+// silently let the last one win, and nesting deeper than a board ever needs, before a value
+// too deep to print or walk is built.
+class StructureCheck {
+public:
+    static constexpr size_t MAX_DEPTH = 32;
+
+    explicit StructureCheck(const std::string& name) : name_(name) {}
+
+    void see(json::parse_event_t event, const json& parsed) {
+        switch (event) {
+            case json::parse_event_t::object_start:
+            case json::parse_event_t::array_start: {
+                const std::string path = stack_.empty() ? std::string() : childPath(stack_.back());
+                if (stack_.size() >= MAX_DEPTH) {
+                    fail(path, "nested deeper than " + std::to_string(MAX_DEPTH) + " levels");
+                }
+                stack_.push_back(
+                    Level{event == json::parse_event_t::object_start, path, {}, {}, 0});
+                break;
+            }
+            case json::parse_event_t::key: {
+                Level& object = stack_.back();
+                object.key = parsed.get<std::string>();
+                if (!object.keys.insert(object.key).second) {
+                    fail(at(object.path, object.key), "key \"" + object.key + "\" is given twice");
+                }
+                break;
+            }
+            case json::parse_event_t::object_end:
+            case json::parse_event_t::array_end:
+                stack_.pop_back();
+                elementDone();
+                break;
+            case json::parse_event_t::value:
+                elementDone();
+                break;
+        }
+    }
+
+private:
+    struct Level {
+        bool object;
+        std::string path;
+        std::set<std::string> keys;  // of an object, so far
+        std::string key;             // of an object, the current one
+        size_t index;                // of an array, the current element
+    };
+
+    [[noreturn]] void fail(const std::string& path, const std::string& problem) const {
+        failIn(name_, path, problem);
+    }
+
+    static std::string childPath(const Level& level) {
+        return level.object ? at(level.path, level.key)
+                            : level.path + "[" + std::to_string(level.index) + "]";
+    }
+
+    void elementDone() {
+        if (!stack_.empty() && !stack_.back().object) ++stack_.back().index;
+    }
+
+    std::string name_;
+    std::vector<Level> stack_;
+};
+
 class Reader {
 public:
     explicit Reader(const std::string& name) : name_(name) {}
 
     [[noreturn]] void fail(const std::string& path, const std::string& problem) const {
-        throw BoardError(name_ + ": " + (path.empty() ? std::string() : path + ": ") + problem);
+        failIn(name_, path, problem);
     }
 
     std::unique_ptr<Board::Impl> board(const json& root) const {
@@ -98,10 +174,6 @@ private:
         std::string text = value.dump(-1, ' ', false, json::error_handler_t::replace);
         if (text.size() > 40) text = text.substr(0, 37) + "...";
         return text;
-    }
-
-    static std::string at(const std::string& path, const std::string& key) {
-        return path.empty() ? key : path + "." + key;
     }
 
     void checkKeys(const json& object, const std::string& path,
@@ -216,7 +288,7 @@ private:
 
     BoardCore core(const json& value, const std::string& path) const {
         expectObject(value, path);
-        checkKeys(value, path, {"type", "master", "status"});
+        checkKeys(value, path, {"type", "master", "status", "failingCommands"});
         BoardCore result;
         if (!value.contains("type")) fail(path, "\"type\" is missing");
         result.type = unsignedNumber(value.at("type"), at(path, "type"), U32_MAX);
@@ -224,9 +296,24 @@ private:
             result.hasRawStatus = true;
             result.rawStatus = rawStatus(value.at("status"), at(path, "status"));
         }
+        if (value.contains("failingCommands")) {
+            result.failingCommands =
+                failingCommands(value.at("failingCommands"), at(path, "failingCommands"));
+        }
         if (value.contains("master"))
             result.master = master(value.at("master"), at(path, "master"));
         return result;
+    }
+
+    // Command codes 1 to 7, as bits.
+    uint32_t failingCommands(const json& value, const std::string& path) const {
+        if (!value.is_array()) fail(path, "expected an array, got " + shown(value));
+        uint32_t codes = 0;
+        for (size_t i = 0; i < value.size(); ++i) {
+            codes |=
+                1u << number(value[i], path + "[" + std::to_string(i) + "]", Range{1, 7, false});
+        }
+        return codes;
     }
 
     // One hexadecimal number of any length: bit k of the number is status bit k.
@@ -370,10 +457,15 @@ private:
 
 std::unique_ptr<Board::Impl> readBoard(const std::string& text, const std::string& name) {
     json root;
+    StructureCheck check(name);
     try {
-        root = json::parse(text);
+        root = json::parse(text, [&check](int, json::parse_event_t event, json& parsed) {
+            check.see(event, parsed);
+            return true;
+        });
     } catch (const json::exception& e) {
-        // A number too large for the parser is its out_of_range, not a parse_error. Drop the library's "[json.exception.parse_error.N] " prefix.
+        // A number too large for the parser is its out_of_range, not a parse_error. Drop the
+        // library's "[json.exception.parse_error.N] " prefix.
         std::string what = e.what();
         const size_t end = what.find("] ");
         if (what.rfind("[json.exception.", 0) == 0 && end != std::string::npos)

@@ -12,8 +12,9 @@ namespace OrvRT {
 
 void Orv_CoreComm::getCoreStatus(uint32_t handle, ORV_CORE_REF ref, ORV_CORE_INFO* info,
                                  Orv_ByteBuffer& status, uint32_t bitCount) {
-    OrvSim::JtagSession& session = OrvSim::JtagSession::get(handle);
-    session.sendQueued();
+    const std::shared_ptr<OrvSim::JtagSession> session = OrvSim::JtagSession::get(handle);
+    session->noteHostCall();
+    session->sendQueued();
     // Never more bits than the buffer holds.
     const uint64_t capacity = static_cast<uint64_t>(status.getSize()) * 8u;
     const auto bits = static_cast<uint32_t>(bitCount < capacity ? bitCount : capacity);
@@ -22,7 +23,7 @@ void Orv_CoreComm::getCoreStatus(uint32_t handle, ORV_CORE_REF ref, ORV_CORE_INF
     const bool found =
         board != nullptr && board->coreStatus(ref.device, ref.userChain, ref.coreIndex, filled.word,
                                               status.uPtr(), bits);
-    session.coreStatusRead(ref.device, ref.userChain, ref.coreIndex, filled.word[1], found);
+    session->coreStatusRead(ref.device, ref.userChain, ref.coreIndex, filled.word[1], found);
     if (!found) {
         throw std::logic_error("No core " + std::to_string(ref.coreIndex) + " on user chain " +
                                std::to_string(ref.userChain) + " of device " +

@@ -1,5 +1,6 @@
 // What a host application drives: the board behind every session, the end of a session and
 // a fresh host for tests.
+#include <atomic>
 #include <mutex>
 
 #include "host/OrvCore.h"
@@ -13,6 +14,7 @@ namespace OrvSim {
 
 namespace {
 std::mutex boardMutex;
+std::atomic<bool> boardRefuses{false};
 // Never destroyed: plug-in code may still reach the host while the process ends.
 std::shared_ptr<Board>& currentBoard() {
     static auto* board = new std::shared_ptr<Board>();
@@ -25,10 +27,13 @@ void setBoard(std::shared_ptr<Board> board) {
     {
         std::lock_guard<std::mutex> guard(boardMutex);
         old = std::move(currentBoard());
+        boardRefuses.store(board != nullptr && board->hasFailingCommands());
         currentBoard() = std::move(board);
     }
     // The old board goes away outside the lock.
 }
+
+bool boardMayRefuseCommands() { return boardRefuses.load(std::memory_order_relaxed); }
 
 std::shared_ptr<Board> getBoard() {
     std::lock_guard<std::mutex> guard(boardMutex);
@@ -36,24 +41,20 @@ std::shared_ptr<Board> getBoard() {
 }
 
 void endSession(uint32_t handle) {
-    JtagSession& session = JtagSession::get(handle);
-    for (OrvRT::SessionMessageListener* listener : listenersSnapshot()) {
-        listener->sessionEnded(handle);
-    }
+    const std::shared_ptr<JtagSession> session = JtagSession::get(handle);
+    notifySessionEnded(handle);
     for (OrvRT::Orv_Core* core : takeSessionCores(handle)) delete core;
-    session.end();
+    session->end();
+    JtagSession::forget(handle);
 }
 
 void resetHost() {
-    // Only the sessions used since the last reset can hold anything: a process that has seen
-    // many handles (a fuzzer) does not pay for all of them on every reset.
-    const std::vector<uint32_t> used = JtagSession::usedHandles();
-    for (uint32_t handle : used) endSession(handle);
+    for (uint32_t handle : JtagSession::handles()) endSession(handle);
+    forgetListeners();
     setMessageSink(nullptr);
     setTraceSink(nullptr);
     setBoard(nullptr);
     setDataDir(std::string());
-    for (uint32_t handle : used) JtagSession::get(handle).reset();
 }
 
 }  // namespace OrvSim

@@ -1,26 +1,22 @@
 // The stand-in host's JTAG sessions: the queue of pending writes, counters and trace lines.
 #include "hostsim/jtag/JtagSession.h"
 
+#include <chrono>
 #include <cstring>
 #include <map>
 #include <memory>
-#include <set>
+#include <stdexcept>
+
+#include "hostsim/jtag/SessionRegistry.h"
 
 namespace OrvSim {
 
 namespace {
 
-std::mutex registryMutex;
-// Sessions live until the process ends: references handed out stay valid.
-std::map<uint32_t, std::unique_ptr<JtagSession>>& registry() {
-    static auto* sessions = new std::map<uint32_t, std::unique_ptr<JtagSession>>();
+// Never destroyed: plug-in code may still reach the host while the process ends.
+SessionRegistry<JtagSession>& registry() {
+    static auto* sessions = new SessionRegistry<JtagSession>();
     return *sessions;
-}
-
-// The handles of the sessions whose used_ is set.
-std::set<uint32_t>& usedSet() {
-    static auto* handles = new std::set<uint32_t>();
-    return *handles;
 }
 
 // "0x" and ceil(bitCount/4) upper-case digits of the bits, bit k of the text's number being
@@ -57,22 +53,13 @@ size_t byteCount(uint32_t bitCount) {
 
 }  // namespace
 
-JtagSession& JtagSession::get(uint32_t handle) {
-    // Most calls come for the session of the previous call on the same thread.
-    thread_local JtagSession* last = nullptr;
-    if (last != nullptr && last->handle_ == handle && last->used_.load(std::memory_order_relaxed))
-        return *last;
-    std::lock_guard<std::mutex> guard(registryMutex);
-    auto& slot = registry()[handle];
-    if (!slot) slot.reset(new JtagSession(handle));
-    last = slot.get();
-    if (!last->used_.exchange(true)) usedSet().insert(handle);
-    return *last;
-}
+std::shared_ptr<JtagSession> JtagSession::get(uint32_t handle) { return registry().get(handle); }
 
-std::vector<uint32_t> JtagSession::usedHandles() {
-    std::lock_guard<std::mutex> guard(registryMutex);
-    return std::vector<uint32_t>(usedSet().begin(), usedSet().end());
+std::vector<uint32_t> JtagSession::handles() { return registry().handles(); }
+
+void JtagSession::forget(uint32_t handle) {
+    // Destroyed here, outside the registry, unless a call still holds it.
+    registry().drop(handle);
 }
 
 void JtagSession::queueWrite(JtagWriteRunner runner, void* context, const JtagCommand& command,
@@ -158,14 +145,34 @@ void JtagSession::end() {
     std::vector<uint8_t>().swap(bytes_);
 }
 
-void JtagSession::reset() {
+void JtagSession::lockTarget(uint32_t timeout) {
+    if (!targetLock_.try_lock_for(std::chrono::milliseconds(timeout))) {
+        throw std::runtime_error("Timed out after " + std::to_string(timeout) +
+                                 " ms waiting for the JTAG target of session " +
+                                 std::to_string(handle_) + ".");
+    }
+    if (depth_++ == 0) holder_.store(std::this_thread::get_id());
     std::lock_guard<std::recursive_mutex> guard(mutex_);
-    pending_.clear();
-    bytes_.clear();
-    stats_ = JtagStats();
-    std::lock_guard<std::mutex> registryGuard(registryMutex);
-    used_.store(false);
-    usedSet().erase(handle_);
+    ++takesByTimeout_[timeout];
+}
+
+void JtagSession::unlockTarget() {
+    if (--depth_ == 0) holder_.store(std::thread::id());
+    targetLock_.unlock();
+}
+
+void JtagSession::noteHostCall() {
+    const bool held = holder_.load(std::memory_order_relaxed) == std::this_thread::get_id();
+    (held ? callsHeld_ : callsUnheld_).fetch_add(1, std::memory_order_relaxed);
+}
+
+TargetLockUse JtagSession::takeLockUse() {
+    std::lock_guard<std::recursive_mutex> guard(mutex_);
+    TargetLockUse taken;
+    taken.takesByTimeout.swap(takesByTimeout_);
+    taken.callsHeld = callsHeld_.exchange(0);
+    taken.callsUnheld = callsUnheld_.exchange(0);
+    return taken;
 }
 
 }  // namespace OrvSim

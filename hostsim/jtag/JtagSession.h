@@ -4,8 +4,11 @@
 
 #include <atomic>
 #include <cstdint>
+#include <map>
+#include <memory>
 #include <mutex>
 #include <string>
+#include <thread>
 #include <vector>
 
 #include "host/OrvExport.h"
@@ -13,6 +16,9 @@
 #include "hostsim/Sim.h"
 
 namespace OrvSim {
+
+template <class T>
+class SessionRegistry;
 
 // Where a command goes and what it shifts.
 struct JtagCommand {
@@ -29,12 +35,13 @@ using JtagWriteRunner = void (*)(void* context, const JtagCommand& command, cons
 
 class ORV_JTAG_API JtagSession {
 public:
-    // The session of handle, created on first use. Sessions are never destroyed, so the
-    // reference stays valid for the life of the process.
-    static JtagSession& get(uint32_t handle);
-    // The handles used since their session was last reset, ascending: what a fresh host has
-    // to end, however many sessions the process has seen.
-    static std::vector<uint32_t> usedHandles();
+    // The session of handle, created on first use and dropped by forget(). Holding the pointer
+    // keeps an ended session's object alive, so a call that began before the end completes.
+    static std::shared_ptr<JtagSession> get(uint32_t handle);
+    // The handles of the sessions the host holds, ascending.
+    static std::vector<uint32_t> handles();
+    // Drops the host's entry of the session (what endSession leaves of it: nothing).
+    static void forget(uint32_t handle);
 
     uint32_t handle() const { return handle_; }
 
@@ -53,17 +60,23 @@ public:
     void coreCountRead();
 
     JtagStats takeStats();
-    // Sends what is queued (a closing cable flushes), then empties the queue. Counters stay.
+    // Sends what is queued (a closing cable flushes), then empties the queue.
     void end();
-    // Counters back to zero as well, for a fresh host; the session counts as unused again.
-    void reset();
 
-    std::recursive_timed_mutex& targetLock() { return targetLock_; }
+    // The target lock: the same thread may take it again; throws std::runtime_error when the
+    // timeout (ms) runs out. Each take and its timeout are recorded.
+    void lockTarget(uint32_t timeout);
+    void unlockTarget();
+    // Records whether the caller of a host operation on the session holds its target.
+    void noteHostCall();
+    TargetLockUse takeLockUse();
 
     JtagSession(const JtagSession&) = delete;
     JtagSession& operator=(const JtagSession&) = delete;
 
 private:
+    template <class T>
+    friend class SessionRegistry;
     explicit JtagSession(uint32_t handle) : handle_(handle) {}
     struct Pending {
         JtagWriteRunner runner;
@@ -74,21 +87,29 @@ private:
     void runPendingLocked();
 
     const uint32_t handle_;
-    std::atomic<bool> used_{false};
     std::recursive_timed_mutex targetLock_;
-    // Guards the queue and counters; recursive so that a sink may read counters.
+    std::atomic<std::thread::id> holder_{};
+    uint32_t depth_ = 0;  // nested takes of the holder; only the holder touches it
+    // Guards the queue, counters and lock record; recursive so that a sink may read counters.
     std::recursive_mutex mutex_;
     std::vector<Pending> pending_;
     std::vector<uint8_t> bytes_;  // bits of all pending writes, reused
     bool running_ = false;
     JtagStats stats_;
+    std::map<uint32_t, uint64_t> takesByTimeout_;
+    // Counted on every host operation, so without the mutex.
+    std::atomic<uint64_t> callsHeld_{0};
+    std::atomic<uint64_t> callsUnheld_{0};
 };
 
 // Whether a trace sink is set (cheap; checked before formatting a line).
 ORV_JTAG_API bool traceEnabled();
 // Sends a line to the trace sink, if any.
 ORV_JTAG_API void traceLine(const std::string& line);
-// The registered listeners, copied so that a listener may register another meanwhile.
-ORV_JTAG_API std::vector<OrvRT::SessionMessageListener*> listenersSnapshot();
+// Tells every registered listener that the session ended, holding the host's listener registry
+// all the while, as a host may: a listener registered meanwhile hears of the next end.
+ORV_JTAG_API void notifySessionEnded(uint32_t handle);
+// Forgets every registered listener (a fresh host).
+ORV_JTAG_API void forgetListeners();
 
 }  // namespace OrvSim

@@ -4,9 +4,7 @@
 
 #include <algorithm>
 #include <atomic>
-#include <chrono>
 #include <mutex>
-#include <stdexcept>
 #include <string>
 #include <vector>
 
@@ -30,7 +28,9 @@ TraceSink& traceSink() {
     return *sink;
 }
 
-std::mutex listenerMutex;
+// Recursive: a listener told of an end may register another.
+std::recursive_mutex listenerMutex;
+std::atomic<uint64_t> registrations{0};
 std::vector<OrvRT::SessionMessageListener*>& listeners() {
     // Never destroyed: a plug-in unloaded at exit may still register.
     static auto* list = new std::vector<OrvRT::SessionMessageListener*>();
@@ -61,30 +61,40 @@ void traceLine(const std::string& line) {
     if (sink) sink(line);
 }
 
-JtagStats takeStats(uint32_t handle) { return JtagSession::get(handle).takeStats(); }
+JtagStats takeStats(uint32_t handle) { return JtagSession::get(handle)->takeStats(); }
 
-std::vector<OrvRT::SessionMessageListener*> listenersSnapshot() {
-    std::lock_guard<std::mutex> guard(listenerMutex);
-    return listeners();
+TargetLockUse takeTargetLockUse(uint32_t handle) { return JtagSession::get(handle)->takeLockUse(); }
+
+uint64_t listenerRegistrations() { return registrations.load(); }
+
+void notifySessionEnded(uint32_t handle) {
+    std::lock_guard<std::recursive_mutex> guard(listenerMutex);
+    const std::vector<OrvRT::SessionMessageListener*> now = listeners();
+    for (OrvRT::SessionMessageListener* listener : now) listener->sessionEnded(handle);
+}
+
+void forgetListeners() {
+    std::lock_guard<std::recursive_mutex> guard(listenerMutex);
+    listeners().clear();
 }
 
 }  // namespace OrvSim
 
 namespace OrvRT {
 
-OrvJtagTargetLock::OrvJtagTargetLock(uint32_t handle, uint32_t timeout) : handle_(handle) {
-    auto& lock = OrvSim::JtagSession::get(handle).targetLock();
-    if (!lock.try_lock_for(std::chrono::milliseconds(timeout))) {
-        throw std::runtime_error("Timed out after " + std::to_string(timeout) +
-                                 " ms waiting for the JTAG target of session " +
-                                 std::to_string(handle) + ".");
-    }
+OrvJtagTargetLock::OrvJtagTargetLock(uint32_t handle, uint32_t timeout) {
+    std::shared_ptr<OrvSim::JtagSession> session = OrvSim::JtagSession::get(handle);
+    session->lockTarget(timeout);
+    target_ = std::move(session);
 }
 
-OrvJtagTargetLock::~OrvJtagTargetLock() { OrvSim::JtagSession::get(handle_).targetLock().unlock(); }
+OrvJtagTargetLock::~OrvJtagTargetLock() {
+    static_cast<OrvSim::JtagSession*>(target_.get())->unlockTarget();
+}
 
 uint32_t addSessionMessageListener(SessionMessageListener* listener) {
-    std::lock_guard<std::mutex> guard(OrvSim::listenerMutex);
+    ++OrvSim::registrations;
+    std::lock_guard<std::recursive_mutex> guard(OrvSim::listenerMutex);
     auto& list = OrvSim::listeners();
     if (listener != nullptr && std::find(list.begin(), list.end(), listener) == list.end()) {
         list.push_back(listener);
@@ -105,6 +115,10 @@ void OrvJtag_session_sendMessage(uint32_t handle, uint32_t severity, const char*
     if (sink) sink(handle, severity, text != nullptr ? std::string(text) : std::string());
 }
 
-void OrvJtag_target_flush(uint32_t handle) { OrvSim::JtagSession::get(handle).flush(); }
+void OrvJtag_target_flush(uint32_t handle) {
+    const std::shared_ptr<OrvSim::JtagSession> session = OrvSim::JtagSession::get(handle);
+    session->noteHostCall();
+    session->flush();
+}
 
 }  // extern "C"

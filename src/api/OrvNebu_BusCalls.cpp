@@ -13,7 +13,7 @@ namespace {
 // reported before any argument check), then op with it.
 template <class Op>
 uint32_t onBus(uint32_t handle, uint32_t device, uint32_t userChain, Op&& op) noexcept {
-    return lockedFrame(handle, [&] { op(busOf(handle, device, userChain)); });
+    return lockedFrame(handle, [&] { op(*busOf(handle, device, userChain)); });
 }
 
 }  // namespace

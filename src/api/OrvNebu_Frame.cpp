@@ -52,8 +52,8 @@ OrvNebu_Slave& resolveSlave(uint32_t handle, const ORV_SLAVE_REF& slaveRef) {
                            std::to_string(slaveRef.slaveIndex) + ".");
 }
 
-OrvNebu_Transaction& busOf(uint32_t handle, uint32_t device, uint32_t userChain) {
-    return *OrvNebu_BusList::getBusList()->getBus(handle, device, userChain);
+OrvNebu_TransactionPtr busOf(uint32_t handle, uint32_t device, uint32_t userChain) {
+    return OrvNebu_BusList::getBusList()->getBus(handle, device, userChain);
 }
 
 }  // namespace OrvRT

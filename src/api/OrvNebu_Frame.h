@@ -5,7 +5,7 @@
 #include <cstdint>
 #include <exception>
 
-#include "bus/OrvNebu_Transaction.h"
+#include "bus/OrvNebu_BusList.h"
 #include "host/OrvJtag.h"
 #include "host/OrvTypes.h"
 
@@ -52,7 +52,7 @@ void checkArgument(bool ok, const char* message);
 // The slave object registered under the reference; throws when there is none.
 OrvNebu_Slave& resolveSlave(uint32_t handle, const ORV_SLAVE_REF& slaveRef);
 
-// The transaction object of a bus; throws when there is no bus.
-OrvNebu_Transaction& busOf(uint32_t handle, uint32_t device, uint32_t userChain);
+// The transaction object of a bus, to hold while it is used; throws when there is no bus.
+OrvNebu_TransactionPtr busOf(uint32_t handle, uint32_t device, uint32_t userChain);
 
 }  // namespace OrvRT

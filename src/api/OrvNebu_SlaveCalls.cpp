@@ -35,11 +35,11 @@ Orv_HashMapCStr& mapOf(ORV_HASHMAP_HANDLE* handle) {
 }
 
 void validateSlaveIndex(uint32_t handle, const ORV_SLAVE_REF& ref) {
-    OrvNebu_Transaction& bus = busOf(handle, ref.device, ref.userChain);
-    const uint32_t count = bus.getSlaveCount(handle, ref.device, ref.userChain);
+    const OrvNebu_TransactionPtr bus = busOf(handle, ref.device, ref.userChain);
+    const uint32_t count = bus->getSlaveCount(handle, ref.device, ref.userChain);
     std::vector<uint32_t> handles(count, 0);
-    bus.getSlaveHandles(handle, ref.device, ref.userChain, count != 0 ? handles.data() : nullptr,
-                        count);
+    bus->getSlaveHandles(handle, ref.device, ref.userChain, count != 0 ? handles.data() : nullptr,
+                         count);
     for (uint32_t h : handles) {
         if (h == ref.slaveIndex) return;
     }
@@ -59,9 +59,9 @@ ORVNEBU_API uint32_t ORVNEBU_CALL OrvNebu_getSlaveInfo(uint32_t handle, ORV_SLAV
     return lockedFrame(handle, [&] {
         checkArgument(slaveInfoHash != nullptr && *slaveInfoHash != nullptr,
                       "OrvNebu_getSlaveInfo() argument checking failed:slaveInfoHash != 0");
-        OrvNebu_Transaction& bus = busOf(handle, slaveRef.device, slaveRef.userChain);
+        const OrvNebu_TransactionPtr bus = busOf(handle, slaveRef.device, slaveRef.userChain);
         uint32_t w[SLAVE_ID_WORDS] = {0, 0, 0, 0, 0, 0, 0, 0};
-        bus.burstSlaveRead(handle, slaveRef, SLAVE_ID_ADDRESS, 1, w, SLAVE_ID_WORDS, nullptr);
+        bus->burstSlaveRead(handle, slaveRef, SLAVE_ID_ADDRESS, 1, w, SLAVE_ID_WORDS, nullptr);
         Orv_HashMapCStr& info = mapOf(slaveInfoHash);
         info["slave_type"] = dec(w[0]);
         info["orv_drv_ver"] = dec(w[1]);

@@ -6,6 +6,8 @@
 #include <memory>
 #include <stdexcept>
 #include <string>
+#include <utility>
+#include <vector>
 
 #include "bus/OrvNebu_PivoTransaction.h"
 #include "host/OrvCore.h"
@@ -39,39 +41,51 @@ void OrvNebu_BusList::sessionNotice(uint32_t) {}
 
 void OrvNebu_BusList::sessionEnded(uint32_t handle) {
     constexpr uint32_t LAST = std::numeric_limits<uint32_t>::max();
-    std::lock_guard<std::mutex> guard(mutex_);
-    auto it = buses_.lower_bound(Key(handle, 0, 0));
-    const auto end = buses_.upper_bound(Key(handle, LAST, LAST));
-    while (it != end) {
-        delete it->second;
-        it = buses_.erase(it);
+    std::vector<OrvNebu_TransactionPtr> dropped;
+    {
+        std::lock_guard<std::mutex> guard(mutex_);
+        auto it = buses_.lower_bound(Key(handle, 0, 0));
+        const auto end = buses_.upper_bound(Key(handle, LAST, LAST));
+        while (it != end) {
+            dropped.push_back(std::move(it->second));
+            it = buses_.erase(it);
+        }
     }
+    // Objects no call holds any more go here, outside the lock.
 }
 
-OrvNebu_Transaction* OrvNebu_BusList::findBus(uint32_t handle, uint32_t device,
-                                              uint32_t userChain) {
+OrvNebu_TransactionPtr OrvNebu_BusList::findBus(uint32_t handle, uint32_t device,
+                                                uint32_t userChain) {
     std::lock_guard<std::mutex> guard(mutex_);
     auto it = buses_.find(Key(handle, device, userChain));
     return it == buses_.end() ? nullptr : it->second;
 }
 
 void OrvNebu_BusList::addBus(uint32_t handle, uint32_t device, uint32_t userChain,
-                             OrvNebu_Transaction* bus) {
+                             OrvNebu_TransactionPtr bus) {
     // The host may have forgotten the list with the last session; register again each time
-    // the list starts afresh.
-    std::lock_guard<std::mutex> guard(mutex_);
-    if (buses_.empty()) addSessionMessageListener(this);
-    buses_[Key(handle, device, userChain)] = bus;
+    // the list starts afresh. Not under the lock: the host may tell of a session end, which
+    // takes the lock, while it holds its own registry.
+    bool empty;
+    {
+        std::lock_guard<std::mutex> guard(mutex_);
+        empty = buses_.empty();
+    }
+    if (empty) addSessionMessageListener(this);
+    OrvNebu_TransactionPtr replaced;
+    {
+        std::lock_guard<std::mutex> guard(mutex_);
+        replaced = std::exchange(buses_[Key(handle, device, userChain)], std::move(bus));
+    }
 }
 
 void OrvNebu_BusList::removeBus(uint32_t handle, uint32_t device, uint32_t userChain,
-                                OrvNebu_Transaction*& bus) {
+                                OrvNebu_TransactionPtr& bus) {
     {
         std::lock_guard<std::mutex> guard(mutex_);
         buses_.erase(Key(handle, device, userChain));
     }
-    delete bus;
-    bus = nullptr;
+    bus.reset();
 }
 
 uint32_t OrvNebu_BusList::discoverBus(uint32_t handle, uint32_t device, uint32_t userChain) {
@@ -99,7 +113,7 @@ uint32_t OrvNebu_BusList::discoverBus(uint32_t handle, uint32_t device, uint32_t
         }
     }
 
-    OrvNebu_Transaction* old = findBus(handle, device, userChain);
+    OrvNebu_TransactionPtr old = findBus(handle, device, userChain);
     if (old != nullptr) removeBus(handle, device, userChain, old);
 
     if (slaveCount == 0) return 0;
@@ -107,21 +121,22 @@ uint32_t OrvNebu_BusList::discoverBus(uint32_t handle, uint32_t device, uint32_t
         throw std::logic_error(
             busMessage("This NEBU Bus type is not supported Device:", device, userChain));
 
-    auto created = std::make_unique<OrvNebu_PivoTransaction>(
+    const OrvNebu_TransactionPtr bus = std::make_shared<OrvNebu_PivoTransaction>(
         ORV_CORE_REF{device, userChain, masterIndex}, slaveCount);
-    OrvNebu_Transaction* bus = created.get();
     addBus(handle, device, userChain, bus);
-    created.release();
     const uint32_t found = bus->getSlaveCount(handle, device, userChain);
     bus->resetBus(handle, device, userChain);
     return found;
 }
 
-OrvNebu_Transaction* OrvNebu_BusList::getBus(uint32_t handle, uint32_t device, uint32_t userChain) {
-    if (OrvNebu_Transaction* bus = findBus(handle, device, userChain)) return bus;
-    if (discoverBus(handle, device, userChain) == 0)
-        throw std::logic_error(busMessage("Invalid NEBU Bus Device:", device, userChain));
-    return findBus(handle, device, userChain);
+OrvNebu_TransactionPtr OrvNebu_BusList::getBus(uint32_t handle, uint32_t device,
+                                               uint32_t userChain) {
+    if (OrvNebu_TransactionPtr bus = findBus(handle, device, userChain)) return bus;
+    if (discoverBus(handle, device, userChain) != 0) {
+        if (OrvNebu_TransactionPtr bus = findBus(handle, device, userChain)) return bus;
+    }
+    // No bus, or the session ended between its discovery and here.
+    throw std::logic_error(busMessage("Invalid NEBU Bus Device:", device, userChain));
 }
 
 }  // namespace OrvRT

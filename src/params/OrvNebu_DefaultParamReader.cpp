@@ -55,8 +55,12 @@ bool exceedsUint32(Size length) {
 
 }  // namespace
 
-OrvNebu_DefaultParamReader::SessionEndListener* OrvNebu_DefaultParamReader::sessionListener =
-    nullptr;
+OrvNebu_DefaultParamReader::SessionEndListener& OrvNebu_DefaultParamReader::sessionListener() {
+    // Never destroyed: the host keeps what it is given. Made once even when two sessions read
+    // their first files at the same time.
+    static SessionEndListener* const listener = new SessionEndListener();
+    return *listener;
+}
 
 OrvNebu_DefaultParamReader::ParamStorage& OrvNebu_DefaultParamReader::paramStorage() {
     static ParamStorage storage;
@@ -83,12 +87,7 @@ void OrvNebu_DefaultParamReader::SessionEndListener::sessionEnded(uint32_t handl
 }
 
 OrvNebu_DefaultParamReader::OrvNebu_DefaultParamReader(uint32_t handle, const std::string& fileName)
-    : handle_(handle), fileName_(fileName) {
-    if (sessionListener == nullptr) {
-        sessionListener = new SessionEndListener();
-        addSessionMessageListener(sessionListener);
-    }
-}
+    : handle_(handle), fileName_(fileName) {}
 
 size_t OrvNebu_DefaultParamReader::cachedFileCount(uint32_t handle) {
     std::lock_guard<std::mutex> guard(storageMutex());
@@ -110,6 +109,15 @@ OrvNebu_DefaultParamReader::ChoiceActions* OrvNebu_DefaultParamReader::getFromSt
 
 OrvNebu_DefaultParamReader::ChoiceActions* OrvNebu_DefaultParamReader::addToStorage(
     uint32_t handle, const std::string& fileName, std::unique_ptr<ChoiceActions> actions) {
+    // Like the bus list, register whenever the cache starts afresh: a host that forgot the
+    // listener must hear of it again. Not under the cache's lock, which the host's session
+    // end takes while the host may hold its own registry.
+    bool empty;
+    {
+        std::lock_guard<std::mutex> guard(storageMutex());
+        empty = paramStorage().empty();
+    }
+    if (empty) addSessionMessageListener(&sessionListener());
     // An entry already there keeps its actions (slaves may refer to them).
     std::lock_guard<std::mutex> guard(storageMutex());
     return paramStorage()

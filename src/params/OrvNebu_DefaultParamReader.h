@@ -91,7 +91,8 @@ private:
     std::string fileName_;
     std::string header_;
 
-    static SessionEndListener* sessionListener;
+    // The one listener, registered with the host whenever the cache has been empty.
+    static SessionEndListener& sessionListener();
 };
 
 }  // namespace OrvRT

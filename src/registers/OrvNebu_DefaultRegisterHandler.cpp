@@ -87,7 +87,7 @@ void OrvNebu_DefaultRegisterHandler::setValue(const Register& reg, WordBlock& bl
 
 void OrvNebu_DefaultRegisterHandler::getRegisters(uint32_t handle, const ORV_SLAVE_REF& slaveRef,
                                                   Orv_HashMapCStr* registers) {
-    OrvNebu_Transaction* bus =
+    const OrvNebu_TransactionPtr bus =
         OrvNebu_BusList::getBusList()->getBus(handle, slaveRef.device, slaveRef.userChain);
     WordBlock block;
     if (registers->empty()) {
@@ -114,7 +114,7 @@ void OrvNebu_DefaultRegisterHandler::getRegisters(uint32_t handle, const ORV_SLA
 
 void OrvNebu_DefaultRegisterHandler::setRegisters(uint32_t handle, const ORV_SLAVE_REF& slaveRef,
                                                   Orv_HashMapCStr* registers) {
-    OrvNebu_Transaction* bus =
+    const OrvNebu_TransactionPtr bus =
         OrvNebu_BusList::getBusList()->getBus(handle, slaveRef.device, slaveRef.userChain);
     checkRegisterNames(handle, *registers);
     // Nothing named, nothing to move.

@@ -78,7 +78,7 @@ void OrvNebu_SingleRegisterHandler::setValue(uint32_t handle, const ORV_SLAVE_RE
 
 void OrvNebu_SingleRegisterHandler::getRegisters(uint32_t handle, const ORV_SLAVE_REF& slaveRef,
                                                  Orv_HashMapCStr* registers) {
-    OrvNebu_Transaction* bus =
+    const OrvNebu_TransactionPtr bus =
         OrvNebu_BusList::getBusList()->getBus(handle, slaveRef.device, slaveRef.userChain);
     if (registers->empty()) {
         for (const auto& entry : registerMap_) {
@@ -94,7 +94,7 @@ void OrvNebu_SingleRegisterHandler::getRegisters(uint32_t handle, const ORV_SLAV
 
 void OrvNebu_SingleRegisterHandler::setRegisters(uint32_t handle, const ORV_SLAVE_REF& slaveRef,
                                                  Orv_HashMapCStr* registers) {
-    OrvNebu_Transaction* bus =
+    const OrvNebu_TransactionPtr bus =
         OrvNebu_BusList::getBusList()->getBus(handle, slaveRef.device, slaveRef.userChain);
     checkRegisterNames(handle, *registers);
     // Every value is converted first, so a bad value writes nothing at all.

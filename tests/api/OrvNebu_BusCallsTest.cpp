@@ -4,6 +4,7 @@
 #include <gtest/gtest.h>
 
 #include <functional>
+#include <iterator>
 #include <string>
 #include <vector>
 
@@ -188,6 +189,70 @@ TEST_F(BusCallsTest, DataAlreadyReadStaysWhenTheStatusFails) {
     EXPECT_EQ(OrvNebu_singleSlaveWrite(H, {0, 1, 2}, 0x40, 0x9999, &status), FAILED);
     EXPECT_EQ(words[0], 0x1234u);
     EXPECT_EQ(board()->peek(0, 1, 1, 0x40), 0x0F0F) << "position 2 is not slave 1";
+}
+
+TEST_F(BusCallsTest, ACommandChannelThatFailsFailsTheCallWithTheHostsMessage) {
+    struct Case {
+        uint32_t cmd;  // the command the host refuses to carry to the master
+        std::function<uint32_t()> run;
+    };
+    static uint32_t w[2];
+    static uint32_t status;
+    static char text[9] = "00000000";
+    const Case cases[] = {
+        {1, [] { return OrvNebu_getSlaveCount(H, 0, 1, w); }},  // discovery's bus reset
+        {7, [] { return OrvNebu_clearBusErrorStatus(H, 0, 1); }},
+        {2, [] { return OrvNebu_resetBus(H, 0, 1); }},
+        {1,
+         [] {
+             return OrvNebu_resetSlave(H, {0, 1, 0});
+         }},
+        {3, [] { return OrvNebu_getBusErrorStatus(H, 0, 1, w, 2); }},
+        {4,
+         [] {
+             return OrvNebu_singleSlaveRead(H, {0, 1, 0}, 0x10, w, nullptr);
+         }},
+        {3,
+         [] {
+             return OrvNebu_singleSlaveWrite(H, {0, 1, 0}, 0x10, 1, &status);
+         }},
+        {5,
+         [] {
+             return OrvNebu_singleSlaveReadModifyWrite(H, {0, 1, 0}, 0x10, 1, 0, nullptr);
+         }},
+        {6,
+         [] {
+             return OrvNebu_singleSlaveWriteAndInspect(H, {0, 1, 0}, 0x10, 1, w, nullptr);
+         }},
+        {6,
+         [] {
+             return OrvNebu_burstSlaveRead(H, {0, 1, 0}, 0x10, 1, w, 2, nullptr);
+         }},
+        {4,
+         [] {
+             return OrvNebu_burstSlaveWrite(H, {0, 1, 0}, 0x10, 1, w, 2, nullptr);
+         }},
+        {3, [] { return OrvNebu_broadcastSingleWrite(H, 0, 1, 0x10, 1, &status); }},
+        {6,
+         [] {
+             return OrvNebu_read(H, {0, 1, 0}, 0x10, 2, text);
+         }},
+        {5,
+         [] {
+             return OrvNebu_write(H, {0, 1, 0}, 0x10, 1, "1234");
+         }},
+    };
+    for (size_t i = 0; i < std::size(cases); ++i) {
+        SCOPED_TRACE(i);
+        loadBoard(R"({ "devices": [ { "chains": { "1": { "cores": [ { "type": 14,
+            "failingCommands": [)" +
+                  std::to_string(cases[i].cmd) + R"(], "master": {
+            "slaveCount": 2, "dclkHasReset": true, "slaves": { "0": {}, "1": {} } } } ] } } } ] })");
+        clearLog();
+        EXPECT_EQ(cases[i].run(), FAILED);
+        expectOnlyMessage(256, "Command " + std::to_string(cases[i].cmd) +
+                                   " to core 0 on user chain 1 of device 0 failed.");
+    }
 }
 
 TEST_F(BusCallsTest, BusInfoNeedsTheMasterItWasFoundAs) {

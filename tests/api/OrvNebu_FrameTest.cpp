@@ -6,11 +6,13 @@
 #include <future>
 #include <stdexcept>
 #include <string>
+#include <vector>
 
 #include "api/OrvNebu_Frame.h"
 #include "base/Orv_AbortException.h"
 #include "bus/BusFixture.h"
 #include "host/OrvJtag.h"
+#include "orvnebu/orvnebu.h"
 
 namespace OrvNebuBusTest {
 namespace {
@@ -88,6 +90,73 @@ TEST_F(FrameTest, TheLockIsHeldForTheBodyAndReleasedBeforeTheMessage) {
               FAILED);
     EXPECT_FALSE(duringBody);
     EXPECT_TRUE(duringMessage);
+}
+
+TEST_F(FrameTest, EveryCallButTerminateHoldsTheTargetWithTheSpecifiedTimeout) {
+    loadBoard(R"({ "devices": [ { "chains": { "1": { "cores": [ { "type": 14, "master": {
+        "slaveCount": 2, "slaves": { "0": { "slaveType": "0x11", "driverVersion": 1 } } } } ] } } } ] })");
+    constexpr uint32_t H = 1;
+    const ORV_SLAVE_REF s{0, 1, 0};
+    ORV_HASHMAP_HANDLE regs = makeMap({{"CTRL_ENABLE", "1"}});
+    ORV_HASHMAP_HANDLE mode = makeMap({{"mode", "run"}});
+    ORV_HASHMAP_HANDLE map = nullptr;  // a fresh one for each call that fills it
+    std::vector<std::string> choiceList;
+    ORV_STRINGLIST_HANDLE choices = &choiceList;
+    uint32_t w[2] = {1, 2};
+    uint32_t n = 0;
+    char text[9] = "00000000";
+    ASSERT_EQ(OrvNebu_initialize(H, s), 0u) << joined();
+    struct Call {
+        const char* name;
+        std::function<uint32_t()> run;
+    };
+    const Call calls[] = {
+        {"initialize", [&] { return OrvNebu_initialize(H, s); }},
+        {"getBusInfo", [&] { return OrvNebu_getBusInfo(H, 0, 1, &(map = makeMap())); }},
+        {"getSlaveCount", [&] { return OrvNebu_getSlaveCount(H, 0, 1, &n); }},
+        {"getSlaveHandles", [&] { return OrvNebu_getSlaveHandles(H, 0, 1, w, 2); }},
+        {"getSlaveInfo", [&] { return OrvNebu_getSlaveInfo(H, s, &(map = makeMap())); }},
+        {"getRegisters", [&] { return OrvNebu_getRegisters(H, s, &(map = makeMap())); }},
+        {"setRegisters", [&] { return OrvNebu_setRegisters(H, s, &regs); }},
+        {"getParameters", [&] { return OrvNebu_getParameters(H, s, &(map = makeMap())); }},
+        {"setParameters", [&] { return OrvNebu_setParameters(H, s, &mode); }},
+        {"getParameterChoices", [&] { return OrvNebu_getParameterChoices(H, s, &mode, &choices); }},
+        {"read", [&] { return OrvNebu_read(H, s, 0, 2, text); }},
+        {"write", [&] { return OrvNebu_write(H, s, 0x20, 2, text); }},
+        {"getBusErrorStatus", [&] { return OrvNebu_getBusErrorStatus(H, 0, 1, w, 2); }},
+        {"clearBusErrorStatus", [&] { return OrvNebu_clearBusErrorStatus(H, 0, 1); }},
+        {"resetBus", [&] { return OrvNebu_resetBus(H, 0, 1); }},
+        {"testSlaveInterface", [&] { return OrvNebu_testSlaveInterface(H, s, &n); }},
+        {"resetSlave", [&] { return OrvNebu_resetSlave(H, s); }},
+        {"disableSlave", [&] { return OrvNebu_disableSlave(H, s); }},
+        {"enableSlave", [&] { return OrvNebu_enableSlave(H, s); }},
+        {"singleSlaveRead", [&] { return OrvNebu_singleSlaveRead(H, s, 0, w, &n); }},
+        {"singleSlaveWrite", [&] { return OrvNebu_singleSlaveWrite(H, s, 0x20, 1, &n); }},
+        {"singleSlaveReadModifyWrite",
+         [&] { return OrvNebu_singleSlaveReadModifyWrite(H, s, 0x20, 1, 0xFF00, &n); }},
+        {"singleSlaveWriteAndInspect",
+         [&] { return OrvNebu_singleSlaveWriteAndInspect(H, s, 0x20, 1, w, &n); }},
+        {"burstSlaveRead", [&] { return OrvNebu_burstSlaveRead(H, s, 0, 1, w, 2, &n); }},
+        {"burstSlaveWrite", [&] { return OrvNebu_burstSlaveWrite(H, s, 0x20, 1, w, 2, &n); }},
+        {"broadcastSingleWrite",
+         [&] { return OrvNebu_broadcastSingleWrite(H, 0, 1, 0x20, 1, &n); }},
+        {"terminate", [&] { return OrvNebu_terminate(H, s); }},
+    };
+    for (const Call& call : calls) {
+        SCOPED_TRACE(call.name);
+        OrvSim::takeTargetLockUse(H);
+        EXPECT_EQ(call.run(), 0u) << joined();
+        const OrvSim::TargetLockUse use = OrvSim::takeTargetLockUse(H);
+        if (std::string(call.name) == "terminate") {
+            EXPECT_TRUE(use.takesByTimeout.empty());
+            EXPECT_GT(use.callsUnheld, 0u) << "the host saw it work without the lock";
+            continue;
+        }
+        // Taken (nested calls take it again), always with 60000 ms, for every host operation.
+        ASSERT_EQ(use.takesByTimeout.size(), 1u);
+        EXPECT_EQ(use.takesByTimeout.begin()->first, 60000u);
+        EXPECT_EQ(use.callsUnheld, 0u);
+    }
 }
 
 TEST_F(FrameTest, ASinkThatThrowsDoesNotEscape) {

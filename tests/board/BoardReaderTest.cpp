@@ -114,6 +114,10 @@ TEST(BoardReaderErrors, MessagesNameTheFileThePlaceAndTheProblem) {
         {R"({"devices": [{"chains": {"1": {"cores": [{"type": 3, "status": true}]}}}]})",
          "boards/x.json: devices[0].chains.1.cores[0].status: expected a hexadecimal text, got "
          "true"},
+        {R"({"devices": [{"chains": {"1": {"cores": [{"type": 3, "failingCommands": 4}]}}}]})",
+         "boards/x.json: devices[0].chains.1.cores[0].failingCommands: expected an array, got 4"},
+        {R"({"devices": [{"chains": {"1": {"cores": [{"type": 3, "failingCommands": [1, 8]}]}}}]})",
+         "boards/x.json: devices[0].chains.1.cores[0].failingCommands[1]: 8 is out of range 1..7"},
         {withMaster(R"("slaveCount": 300)"), M + "slaveCount: 300 is out of range 0..255"},
         {withMaster(R"("slaveCount": "0x100")"), M + "slaveCount: 0x100 is out of range 0..255"},
         {withMaster(R"("slaveCount": "99999999999999999999999")"),
@@ -151,6 +155,16 @@ TEST(BoardReaderErrors, MessagesNameTheFileThePlaceAndTheProblem) {
              "(slaveType ... nextSlave)"},
         {withMaster(R"("slaveCount": 1, "slaves": {"0": {"memory": {"0x10": [1, 2], "17": 3}}})"),
          M + "slaves.0.memory.17: address 0x11 is given twice"},
+        // A key given twice is refused wherever it is, even where the last would simply win.
+        {R"({"devices": [], "devices": []})",
+         "boards/x.json: devices: key \"devices\" is given twice"},
+        {withMaster(R"("slaveCount": 2, "slaves": {"0": {}, "1": {"word6": 1, "word6": 2}})"),
+         M + "slaves.1.word6: key \"word6\" is given twice"},
+        {withMaster(R"("slaveCount": 1, "slaves": {"0": {"faulty": true}, "0": {}})"),
+         M + "slaves.0: key \"0\" is given twice"},
+        {R"([[[[[[[[[[[[[[[[[[[[[[[[[[[[[[[[[]]]]]]]]]]]]]]]]]]]]]]]]]]]]]]]]])",
+         "boards/x.json: [0][0][0][0][0][0][0][0][0][0][0][0][0][0][0][0][0][0][0][0][0][0][0]"
+         "[0][0][0][0][0][0][0][0][0]: nested deeper than 32 levels"},
     };
     for (const Case& c : cases) EXPECT_EQ(errorOf(c.json), c.message) << c.json;
 

@@ -4,7 +4,13 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <chrono>
+#include <cstdio>
+#include <cstdlib>
+#include <functional>
+#include <future>
 #include <string>
+#include <thread>
 #include <vector>
 
 #include "bus/BusFixture.h"
@@ -41,8 +47,29 @@ const char* const BOARD_CHANGED = R"({ "devices": [
 const char* const BOARD_NO_MASTER = R"({ "devices": [
   { "chains": { "1": { "cores": [ { "type": 3 } ] } } } ] })";
 
+// A listener that runs what it is given at the next session end it hears of.
+class OnEnd : public OrvRT::SessionMessageListener {
+public:
+    void sessionNotice(uint32_t) override {}
+    void sessionEnded(uint32_t) override {
+        std::function<void()> run;
+        std::swap(run, next);
+        if (run) run();
+    }
+    std::function<void()> next;
+};
+
+// Waits (at most 20 s) until done; whether it is.
+bool waitUntil(const std::function<bool()>& done) {
+    for (int i = 0; i < 20000 && !done(); ++i)
+        std::this_thread::sleep_for(std::chrono::milliseconds(1));
+    return done();
+}
+
 class BusListTest : public BusFixture {
 protected:
+    OnEnd onEnd_;  // outlives the fresh host of TearDown
+
     void SetUp() override {
         BusFixture::SetUp();
         loadBoard(BOARD);
@@ -207,6 +234,51 @@ TEST_F(BusListTest, TheListRegistersAgainOnceItHasBeenEmptied) {
     clearLog();
     EXPECT_EQ(touch(4, 0, 2), 0u);
     EXPECT_EQ(countLines("jtag status device=0 chain=2 core=0"), 2u) << joined();
+}
+
+TEST_F(BusListTest, RegistersWithTheHostOutsideItsOwnLock) {
+    // The host tells onEnd_ of an end first, then the list; the list is registered and empty.
+    OrvRT::addSessionMessageListener(&onEnd_);
+    EXPECT_EQ(slaveCount(1, 0, 1), 4u);
+    OrvSim::endSession(1);
+    const uint64_t registrations = OrvSim::listenerRegistrations();
+    std::thread other;
+    uint32_t otherRc = FAILED;
+    uint32_t otherCount = 0;
+    onEnd_.next = [&] {
+        // While the host holds its registry, another session finds the list's first bus.
+        other = std::thread([&] { otherRc = OrvNebu_getSlaveCount(2, 0, 2, &otherCount); });
+        EXPECT_TRUE(waitUntil([&] { return OrvSim::listenerRegistrations() > registrations; }));
+    };
+    auto ending = std::async(std::launch::async, [] { OrvSim::endSession(3); });
+    if (ending.wait_for(std::chrono::seconds(20)) != std::future_status::ready) {
+        ADD_FAILURE() << "the session end and the registration wait for each other";
+        std::fflush(stdout);
+        std::_Exit(1);  // both threads wait for good
+    }
+    other.join();
+    EXPECT_EQ(otherRc, 0u);
+    EXPECT_EQ(otherCount, 2u);
+}
+
+TEST_F(BusListTest, ACallKeepsItsBusWhileItsSessionEnds) {
+    EXPECT_EQ(slaveCount(1, 0, 1), 4u);
+    OrvRT::addSessionMessageListener(&onEnd_);  // told after the list
+    board()->setResetPolls(0, 1, 3);
+    std::promise<void> told;
+    onEnd_.next = [&] { told.set_value(); };
+    // The host ends the session from another thread while resetBus polls the master; the
+    // call goes on only once the list has dropped the bus.
+    std::thread ending;
+    OrvSim::setTraceSink([&](const std::string& line) {
+        if (line.rfind("jtag read cmd=2", 0) != 0 || ending.joinable()) return;
+        ending = std::thread([] { OrvSim::endSession(1); });
+        EXPECT_EQ(told.get_future().wait_for(std::chrono::seconds(20)), std::future_status::ready);
+    });
+    EXPECT_EQ(OrvNebu_resetBus(1, 0, 1), 0u) << joined();
+    ASSERT_TRUE(ending.joinable());
+    ending.join();
+    EXPECT_EQ(board()->lastResetControl(0, 1), std::vector<uint8_t>{0}) << "the reset completed";
 }
 
 TEST_F(BusListTest, AFailedResetKeepsTheNewBus) {

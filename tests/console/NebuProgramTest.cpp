@@ -113,6 +113,8 @@ TEST_F(NebuProgramTest, BadBoardFilesAreNamedAndTheConsoleDoesNotStart) {
         write(
             "range.json",
             R"({"devices": [{"chains": {"1": {"cores": [{"type": 14, "master": {"slaveCount": 300}}]}}}]})"),
+        write("deep.json", std::string(100000, '[') + std::string(100000, ']')),
+        write("twice.json", R"({"devices": [{"chains": {"1": {}, "1": {}}}]})"),
     };
     for (const auto& board : boards) {
         const Result r = run({"--board", board, "--plugin", NEBU_PLUGIN_PATH, "-e", "stats"});

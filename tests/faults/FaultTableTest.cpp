@@ -233,6 +233,22 @@ std::vector<Fault> faults() {
              EXPECT_EQ(OrvNebu_resetSlave(H, FaultTableTest::ref(1, 1)), ORVNEBU_OK);
              EXPECT_FALSE(t.board()->slaveErrorBit(0, 1, 1));
          }},
+        {"command channel refuses transfers",
+         [](T& t) {
+             t.loadBoard(R"({ "devices": [ { "chains": { "1": { "cores": [ { "type": 3 },
+                 { "type": 14, "failingCommands": [4], "master": { "slaveCount": 1,
+                   "slaves": { "0": { "slaveType": "0x11", "driverVersion": 1 } } } } ] } } } ] })");
+         },
+         [](T& t) { return t.initialize(1, 0); },
+         ORVNEBU_FAILED,
+         {{ERR, "Command 4 to core 1 on user chain 1 of device 0 failed."},
+          {ERR,
+           "Device:0, user chain number:1, slave index:0, is not a valid OrvNebu Slave core."}},
+         [](T& t) {
+             EXPECT_FALSE(t.registered(1, 0));
+             // The bus itself still answers: its reset needs no transfer.
+             EXPECT_EQ(OrvNebu_resetBus(H, 0, 1), ORVNEBU_OK);
+         }},
         {"empty slave position",
          nothing,
          [](T& t) { return t.initialize(1, 2); },

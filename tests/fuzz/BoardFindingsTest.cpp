@@ -17,6 +17,13 @@ std::string loadError(const std::string& json, const std::string& name) {
     }
 }
 
+std::string repeat(const std::string& part, size_t times) {
+    std::string text;
+    text.reserve(part.size() * times);
+    for (size_t i = 0; i < times; ++i) text += part;
+    return text;
+}
+
 TEST(BoardFindings, NumbersTooLargeForTheJsonParserAreABoardError) {
     // The parser reports such numbers as out of range, not as a parse error; the loader let
     // that escape, so the console would not have named the file.
@@ -33,6 +40,21 @@ TEST(BoardFindings, NumbersTooLargeForTheJsonParserAreABoardError) {
     EXPECT_NE(loadError(R"({"devices": [{"chains": {"1": {"cores": [{"type": 1e300}]}}}]})",
                         "range.json"),
               "");
+}
+
+TEST(BoardFindings, NestingOfAnyDepthIsOneBoardError) {
+    // Printing the offending value recursed once per level and ran out of stack.
+    for (size_t depth : {33u, 100000u}) {
+        const std::string arrays = std::string(depth, '[') + std::string(depth, ']');
+        const std::string objects = R"({"devices": [{"chains": {"1": )" +
+                                    repeat(R"({"x": )", depth) + "0" + repeat("}", depth + 2) +
+                                    "]}";
+        for (const std::string& text : {arrays, objects}) {
+            const std::string error = loadError(text, "deep.json");
+            EXPECT_NE(error.find(": nested deeper than 32 levels"), std::string::npos)
+                << error.substr(0, 200);
+        }
+    }
 }
 
 }  // namespace

@@ -297,6 +297,16 @@ TEST_F(ParamReader, SessionEndErasesOnlyThatSession) {
     EXPECT_EQ(1u, load(a, OTHER_SESSION).count("MODE"));
 }
 
+TEST_F(ParamReader, TheCacheRegistersAgainWithAHostThatForgotIt) {
+    const std::string a = write("a.csv", MODE_FILE);
+    for (int host = 0; host < 2; ++host) {
+        OrvSim::resetHost();  // a new host knows no listener
+        load(a);
+        OrvSim::endSession(SESSION);
+        EXPECT_EQ(0u, OrvNebu_DefaultParamReader::cachedFileCount(SESSION)) << "host " << host;
+    }
+}
+
 TEST_F(ParamReader, PrintsTheFileBackAndAgainFromTheCache) {
     const std::string path = write("p.csv",
                                    "Param,Index,Choice,Settings\r\n"
