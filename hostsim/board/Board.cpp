@@ -5,6 +5,7 @@
 #include <cerrno>
 #include <cstdio>
 #include <cstring>
+#include <filesystem>
 #include <stdexcept>
 
 #include "hostsim/board/BoardImpl.h"
@@ -91,6 +92,12 @@ std::shared_ptr<Board> Board::copy() const {
 }
 
 std::shared_ptr<Board> Board::loadFile(const std::string& path) {
+    // Windows refuses to open a folder, POSIX systems fail at the first read: the same words on
+    // both.
+    std::error_code notFolder;
+    if (std::filesystem::is_directory(path, notFolder)) {
+        throw BoardError(path + ": cannot be read: " + std::strerror(EISDIR));
+    }
     std::FILE* file = std::fopen(path.c_str(), "rb");
     if (file == nullptr) {
         const int error = errno;

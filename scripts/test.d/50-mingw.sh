@@ -1,25 +1,22 @@
 #!/usr/bin/env bash
-# The 32-bit Windows DLL of the plug-in, cross-built with mingw-w64 (i686) in build-mingw/:
-# it builds with warnings as errors, exports exactly the OrvNebu_ functions of the public
-# header under their plain names, and needs no DLL of the compiler's runtime.
-set -euo pipefail
-root=$(cd "$(dirname "$0")/../.." && pwd)
-"$root/scripts/bootstrap" g++-mingw-w64-i686
+# The 32-bit Windows DLL of the plug-in, cross-built with mingw-w64 (i686) in build-mingw/ with
+# everything else (the build 70-wine32.sh runs; it is built even where Wine cannot run it): it
+# builds with warnings as errors, exports exactly the OrvNebu_ functions of the public header
+# under their plain names, and needs no DLL of the compiler's runtime.
+source "$(dirname "$0")/common.bash"
+source "$(dirname "$0")/wine.bash"
+need g++-mingw-w64-i686-posix googletest
 build="$root/build-mingw"
 objdump=i686-w64-mingw32-objdump
-fail() { echo "50-mingw: $*" >&2; exit 1; }
 
-cmake -S "$root" -B "$build" -DCMAKE_TOOLCHAIN_FILE="$root/cmake/mingw-i686.cmake" \
-      -DNEBU_WERROR=ON >/dev/null
-cmake --build "$build" -j "$(nproc)"
+mingw_build i686 "$build" wine
 
 dll="$build/bin/orvnebu.dll"
 [ -f "$dll" ] || fail "no $dll"
 for lib in libOrvCore.dll.a libOrvJtag.dll.a libOrvUtil.dll.a liborvnebu.dll.a; do
   [ -f "$build/lib/$lib" ] || fail "no import library $lib"
 done
-# Only the plug-in and its host libraries are built there.
-[ ! -e "$build/bin/nebu.exe" ] || fail "the console was built"
+[ -f "$build/bin/nebu_tests.exe" ] || fail "no nebu_tests.exe"
 
 dump=$("$objdump" -p "$dll")
 grep -q 'file format pei-i386' <<<"$dump" || fail "not a 32-bit DLL"
@@ -40,4 +37,4 @@ imports=$(sed -n 's/^[[:space:]]*DLL Name: //p' <<<"$dump" | sort)
 unexpected=$(grep -v -i -x -e OrvCore.dll -e OrvJtag.dll -e OrvUtil.dll -e KERNEL32.dll \
                          -e msvcrt.dll <<<"$imports" || true)
 [ -z "$unexpected" ] || fail "the DLL needs $unexpected"
-echo "50-mingw: orvnebu.dll (pei-i386) exports the 27 functions; imports: $(echo $imports)"
+echo "$pass: orvnebu.dll (pei-i386) exports the 27 functions; imports: $(echo $imports)"

@@ -74,4 +74,11 @@ int32_t OrvNebu_CsvText::autoBaseToInt32(const std::string& text) {
     return readDigits(text, pos, 10, negative);
 }
 
+void OrvNebu_CsvText::openFile(std::ifstream& in, const std::string& path) {
+#if defined(_WIN32)
+    if (!path.empty() && (path.back() == ' ' || path.back() == '.')) return;
+#endif
+    in.open(path, std::ios::in | std::ios::binary);
+}
+
 }  // namespace OrvRT

@@ -3,6 +3,7 @@
 #pragma once
 
 #include <cstdint>
+#include <fstream>
 #include <string>
 #include <vector>
 
@@ -20,6 +21,11 @@ public:
     // As decimalToInt32, but the base follows the text: 0x/0X hexadecimal, a leading 0 octal,
     // decimal otherwise. Reading stops at the first character that does not fit the base.
     static int32_t autoBaseToInt32(const std::string& text);
+
+    // Opens a file for the readers, in binary: Windows' text mode would end it at a Ctrl-Z (the
+    // readers strip the CR of CR LF themselves). On Windows a name ending in a blank or a dot
+    // stays closed: Windows would drop them and open another file than the one named.
+    static void openFile(std::ifstream& in, const std::string& path);
 };
 
 }  // namespace OrvRT

@@ -9,6 +9,7 @@
 #include <mutex>
 #include <stdexcept>
 
+#include "base/OrvNebu_CsvText.h"
 #include "base/Orv_AbortException.h"
 #include "host/OrvUtil.h"
 
@@ -164,7 +165,8 @@ bool OrvNebu_DefaultParamReader::parseLine(ChoiceActions* actions, uint32_t line
 std::unique_ptr<OrvNebu_DefaultParamReader::ChoiceActions>
 OrvNebu_DefaultParamReader::readParamsFromFile() {
     std::unique_ptr<ChoiceActions> actions(new ChoiceActions());
-    std::ifstream in(fileName_.c_str(), std::ios::in | std::ios::binary);
+    std::ifstream in;
+    OrvNebu_CsvText::openFile(in, fileName_);
     if (!in) {
         const std::string text = "Unable to open OrvNebu parameter file: " + fileName_;
         OrvJtag_session_sendMessage(handle_, SEVERITY_ERROR, text.c_str());

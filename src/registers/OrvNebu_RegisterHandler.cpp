@@ -84,7 +84,8 @@ OrvNebu_RegisterHandler::Register* OrvNebu_RegisterHandler::findRegisterMutable(
 
 void OrvNebu_RegisterHandler::readRegistersFromFile(uint32_t handle) {
     const std::string fileName = getRegFilename();
-    std::ifstream in(fileName, std::ios::in);
+    std::ifstream in;
+    OrvNebu_CsvText::openFile(in, fileName);
     const auto cannotOpen = [&]() {
         std::string text = "Unable to open OrvNebu register file: " + fileName;
         OrvJtag_session_sendMessage(handle, SEVERITY_ERROR, text.c_str());

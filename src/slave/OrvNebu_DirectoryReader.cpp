@@ -72,14 +72,17 @@ bool OrvNebu_DirectoryReader::parseLine(uint32_t lineNumber, const std::string& 
 }
 
 bool OrvNebu_DirectoryReader::getResult(Orv_HashMapCStr& entry) {
-    std::ifstream in(fileName_, std::ios::in);
-    if (!in.is_open()) {
+    std::ifstream in;
+    OrvNebu_CsvText::openFile(in, fileName_);
+    std::string line;
+    bool haveHeader = in.is_open() && static_cast<bool>(std::getline(in, line));
+    // A path that opens but cannot be read (a directory on POSIX systems; Windows does not open
+    // it at all) is one that cannot be opened, not one with a bad header.
+    if (!in.is_open() || in.bad()) {
         std::string text = "Unable to open " + fileName_;
         OrvJtag_session_sendMessage(handle_, SEVERITY_ERROR, text.c_str());
         throw Orv_AbortException();
     }
-    std::string line;
-    bool haveHeader = static_cast<bool>(std::getline(in, line));
     if (haveHeader) stripCR(line);
     if (!haveHeader || !parseHeader(line)) {
         std::string text = "Unable to parse header of CSV file: " + fileName_;

@@ -1,11 +1,11 @@
 // The board file reader: number forms, defaults, and one clear error per malformed file.
 #include <gtest/gtest.h>
-#include <unistd.h>
 
-#include <cstdio>
+#include <filesystem>
 #include <fstream>
 
 #include "board/BoardBus.h"
+#include "support/NebuRun.h"
 
 using boardtest::BoardBus;
 using OrvSim::Board;
@@ -190,10 +190,8 @@ TEST(BoardReaderErrors, UnreadableFiles) {
     }
 
     // A file's own name is the name in its errors.
-    char name[] = "/tmp/nebu_board_XXXXXX";
-    const int fd = mkstemp(name);
-    ASSERT_GE(fd, 0);
-    close(fd);
+    const std::filesystem::path dir = nebutest::makeTempDir("nebu_board_");
+    const std::string name = (dir / "board.json").string();
     {
         std::ofstream out(name);
         out << R"({"devices": [{"trellom": 0}]})";
@@ -203,9 +201,9 @@ TEST(BoardReaderErrors, UnreadableFiles) {
         ADD_FAILURE() << "loaded a malformed file";
     } catch (const BoardError& e) {
         EXPECT_EQ(std::string(e.what()),
-                  std::string(name) + ": devices[0].trellom: expected true or false, got 0");
+                  name + ": devices[0].trellom: expected true or false, got 0");
     }
-    std::remove(name);
+    std::filesystem::remove_all(dir);
 }
 
 }  // namespace

@@ -1,12 +1,15 @@
 // The built nebu program run as a user runs it: options, board files, -e commands, scripts
 // and standard input, checking standard output, standard error and the exit status.
-#include <fcntl.h>
 #include <gtest/gtest.h>
+
+#if !defined(_WIN32)
+#include <fcntl.h>
 #include <poll.h>
 #include <pty.h>
 #include <spawn.h>
 #include <sys/wait.h>
 #include <unistd.h>
+#endif
 
 #include <cstdio>
 #include <filesystem>
@@ -22,7 +25,6 @@ namespace {
 
 namespace fs = std::filesystem;
 
-using nebutest::quote;
 using nebutest::readFile;
 using nebutest::Result;
 
@@ -52,9 +54,7 @@ const char* NO_JTAG_STATS =
 class NebuProgramTest : public ::testing::Test {
 protected:
     void SetUp() override {
-        char pattern[] = "/tmp/nebu_console_test_XXXXXX";
-        ASSERT_NE(mkdtemp(pattern), nullptr);
-        dir_ = pattern;
+        dir_ = nebutest::makeTempDir("nebu_console_test_");
         board_ = write("board.json", BOARD);
     }
     void TearDown() override { fs::remove_all(dir_); }
@@ -178,8 +178,7 @@ TEST_F(NebuProgramTest, UnknownCommandsAndBadNumbersAreUsageErrors) {
 
 TEST_F(NebuProgramTest, FunctionsThePluginDoesNotExportAreUnknownCommands) {
     // A host library exports none of the plug-in's functions.
-    const std::string noExports =
-        (fs::path(NEBU_PLUGIN_PATH).parent_path() / "libOrvUtil.so").string();
+    const std::string noExports = NEBU_HOST_LIBRARY_PATH;
     const Result r = run({"--board", board_, "--plugin", noExports, "-e", "getSlaveCount 0 1", "-e",
                           "scan", "-e", "status off", "-e", "peek 0 1 0 0x10"});
     EXPECT_EQ(r.status, 2);
@@ -269,6 +268,8 @@ TEST_F(NebuProgramTest, StandardInputWithoutATerminalHasNoPrompt) {
                          "\n> poke 0 1 0 0x10 1\n");
 }
 
+#if !defined(_WIN32)
+// A terminal of its own for the console is a pseudo-terminal, which Windows does not have.
 TEST_F(NebuProgramTest, TerminalInputGetsAPrompt) {
     int master = -1;
     int terminal = -1;
@@ -320,9 +321,11 @@ TEST_F(NebuProgramTest, TerminalInputGetsAPrompt) {
     EXPECT_NE(screen.find("nebu> ", result), std::string::npos) << screen;
 }
 
+#endif
+
 TEST_F(NebuProgramTest, ScriptRunsBeforeTheCommandsOfTheCommandLine) {
     const std::string script = write("tour.nebu",
-                                     "# a tour\r\n"
+                                     "# a tour (\x1a\x1a: old Windows' end of file)\r\n"
                                      "poke 0 1 0 0x40 \"0x0042\"   # quoted number\r\n"
                                      "\r\n"
                                      "peek 0 1 0 0x40\n");

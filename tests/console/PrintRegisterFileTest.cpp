@@ -6,6 +6,7 @@
 #include <sstream>
 
 #include "Console.h"
+#include "TextFormat.h"
 #include "support/TempDataDir.h"
 #include "support/TestHost.h"
 
@@ -44,14 +45,15 @@ TEST_F(PrintRegisterFileTest, PrintsTheImageOrTheReadersMessages) {
     EXPECT_EQ(console_->exitStatus(), 0);
 
     dir_.write("bad.csv", "h\n\n");
+    // Message texts are escaped: a Windows path shows its backslashes doubled.
     EXPECT_EQ(run("printRegisterFile " + dir_.path("bad.csv")),
               "> printRegisterFile " + dir_.path("bad.csv") +
-                  "\nmessage 512: Unable to parse file: " + dir_.path("bad.csv") +
+                  "\nmessage 512: Unable to parse file: " + escapeText(dir_.path("bad.csv")) +
                   " line:2: \\n\n");
     EXPECT_EQ(run("printRegisterFile " + dir_.path("none.csv")),
               "> printRegisterFile " + dir_.path("none.csv") +
                   "\nmessage 256: Unable to open OrvNebu register file: " +
-                  dir_.path("none.csv") + "\n");
+                  escapeText(dir_.path("none.csv")) + "\n");
     EXPECT_EQ(console_->exitStatus(), 1);
     EXPECT_EQ(err_.str(), "");
 }

@@ -2,10 +2,10 @@
 // console of its own, and what it prints (standard output, then standard error with each line
 // marked, then the exit status) must be NAME.out.
 #include <gtest/gtest.h>
-#include <unistd.h>
 
 #include <algorithm>
 #include <filesystem>
+#include <fstream>
 #include <string>
 #include <vector>
 
@@ -29,13 +29,13 @@ class TranscriptTest : public ::testing::TestWithParam<std::string> {};
 TEST_P(TranscriptTest, PrintsTheRecordedOutput) {
     const fs::path dir = NEBU_TEST_TRANSCRIPTS_DIR;
     // Other builds may run the same transcript at the same time.
-    const fs::path err = fs::temp_directory_path() / ("nebu_transcript_" + GetParam() + "_" +
-                                                      std::to_string(getpid()) + ".err");
+    const fs::path work = nebutest::makeTempDir("nebu_transcript_");
+    std::ofstream(work / "stdin.txt").close();
     const nebutest::Result result = nebutest::runNebu(
         {"--board", NEBU_TEST_BOARDS_DIR "/demo.json", "--data-dir", NEBU_TEST_DATA_DIR "/",
          "--plugin", NEBU_PLUGIN_PATH, (dir / (GetParam() + ".nebu")).string()},
-        "/dev/null", err);
-    fs::remove(err);
+        work / "stdin.txt", work / "stderr.txt");
+    fs::remove_all(work);
     std::string actual = result.out;
     for (size_t start = 0; start < result.err.size();) {
         const size_t end = std::min(result.err.find('\n', start), result.err.size());

@@ -282,8 +282,7 @@ std::vector<Fault> faults() {
          [](T& t) { t.replaceByDirectory("orvnebu_directory.csv"); },
          [](T& t) { return t.initialize(1, 0); },
          ORVNEBU_FAILED,
-         {{ERR, "Unable to parse header of CSV file: {dir}orvnebu_directory.csv"},
-          {ABORT, ABORT_TEXT}},
+         {{ERR, "Unable to open {dir}orvnebu_directory.csv"}, {ABORT, ABORT_TEXT}},
          [](T& t) { EXPECT_FALSE(t.registered(1, 0)); }},
         {"directory file malformed header",
          [](T& t) {

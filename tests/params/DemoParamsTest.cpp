@@ -1,34 +1,27 @@
 // The shipped parameter file on the demo board, as a console user sees it: dump, the choice
 // calls and printParameterFile, run through the built nebu program.
 #include <gtest/gtest.h>
-#include <sys/wait.h>
 
-#include <cstdio>
 #include <filesystem>
 #include <fstream>
 #include <string>
 #include <vector>
 
+#include "TextFormat.h"
+#include "support/NebuRun.h"
+
 namespace {
 
-struct ConsoleRun {
-    int status = -1;
-    std::string out;
-};
+using ConsoleRun = nebutest::Result;
 
 // Runs nebu with the demo board and data and one -e per command; stderr goes to stdout.
-ConsoleRun nebu(const std::vector<std::string>& commands) {
-    std::string line = std::string("'") + NEBU_CONSOLE_PATH + "'";
-    for (const std::string& c : commands) line += " -e '" + c + "'";
-    line += " </dev/null 2>&1";
-    ConsoleRun run;
-    FILE* pipe = popen(line.c_str(), "r");
-    if (pipe == nullptr) return run;
-    char buffer[4096];
-    size_t n;
-    while ((n = fread(buffer, 1, sizeof buffer, pipe)) > 0) run.out.append(buffer, n);
-    const int status = pclose(pipe);
-    run.status = WIFEXITED(status) ? WEXITSTATUS(status) : -1;
+ConsoleRun console(const std::vector<std::string>& commands) {
+    std::vector<std::string> args;
+    for (const std::string& c : commands) args.insert(args.end(), {"-e", c});
+    const std::filesystem::path dir = nebutest::makeTempDir("nebu_demo_params_");
+    std::ofstream(dir / "stdin.txt").close();
+    ConsoleRun run = nebutest::runNebu(args, dir / "stdin.txt", dir / "out.txt", {}, true);
+    std::filesystem::remove_all(dir);
     return run;
 }
 
@@ -43,7 +36,7 @@ std::string between(const std::string& text, const std::string& from, const std:
 }  // namespace
 
 TEST(DemoParams, DumpShowsTheControlBlockParameters) {
-    const ConsoleRun run = nebu({"dump 0 1 0"});
+    const ConsoleRun run = console({"dump 0 1 0"});
     EXPECT_EQ(0, run.status) << run.out;
     EXPECT_EQ(
         "parameters: rc=0x00000000\n"
@@ -56,11 +49,11 @@ TEST(DemoParams, DumpShowsTheControlBlockParameters) {
 
 TEST(DemoParams, SettingAChoiceWritesSeveralRegisters) {
     const ConsoleRun run =
-        nebu({"initialize 0 1 0", "setParameters 0 1 0 mode=SELF_TEST test_pattern=ones",
-              "getRegisters 0 1 0 CTRL_ENABLE CTRL_MODE CTRL_LOOPBACK PATTERN",
-              "getParameters 0 1 0 mode test_pattern", "getParameterChoices 0 1 0 test_pattern",
-              "setParameters 0 1 0 test_pattern=reset_default", "getParameters 0 1 0 test_pattern",
-              "setParameters 0 1 0 clock_divider=fastest"});
+        console({"initialize 0 1 0", "setParameters 0 1 0 mode=SELF_TEST test_pattern=ones",
+                 "getRegisters 0 1 0 CTRL_ENABLE CTRL_MODE CTRL_LOOPBACK PATTERN",
+                 "getParameters 0 1 0 mode test_pattern", "getParameterChoices 0 1 0 test_pattern",
+                 "setParameters 0 1 0 test_pattern=reset_default",
+                 "getParameters 0 1 0 test_pattern", "setParameters 0 1 0 clock_divider=fastest"});
     EXPECT_EQ(1, run.status) << run.out;
     EXPECT_EQ(
         "rc=0x00000000\n"
@@ -83,22 +76,20 @@ TEST(DemoParams, SettingAChoiceWritesSeveralRegisters) {
 }
 
 TEST(DemoParams, PrintParameterFile) {
-    const std::filesystem::path dir =
-        std::filesystem::temp_directory_path() /
-        ("nebu_print_params_" + std::to_string(::testing::UnitTest::GetInstance()->random_seed()));
-    std::filesystem::create_directories(dir);
+    const std::filesystem::path dir = nebutest::makeTempDir("nebu_print_params_");
     const std::string path = (dir / "p.csv").string();
     std::ofstream(path, std::ios::binary) << "Param,Index,Choice\r\n\"M\",0,a,R=01,\nM,1,b,\n";
     const std::string bad = (dir / "bad.csv").string();
     std::ofstream(bad, std::ios::binary) << "h\nM,0\n";
 
-    const ConsoleRun run = nebu(
+    const ConsoleRun run = console(
         {"printParameterFile " + path, "printParameterFile " + path, "printParameterFile " + bad});
     std::filesystem::remove_all(dir);
     const std::string image = "Param,Index,Choice\nM,0,a,R=01\nM,1,b\n";
     EXPECT_EQ("> printParameterFile " + path + "\n" + image + "> printParameterFile " + path +
                   "\n" + image + "> printParameterFile " + bad +
-                  "\nmessage 512: Unable to parse file: " + bad + " line:2: M,0\n",
+                  "\nmessage 512: Unable to parse file: " + nebu::escapeText(bad) +
+                  " line:2: M,0\n",
               run.out);
     EXPECT_EQ(1, run.status);
 }

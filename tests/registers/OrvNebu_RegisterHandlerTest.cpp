@@ -64,6 +64,9 @@ TEST_F(RegisterFileTest, ExcludedLinesQuotesAndLineEnds) {
     EXPECT_EQ(image("h\nA,1,0,0,0,,rw,,y\nB,2,0,0,0,,rw,,y"), expected);
     // The first line is never parsed.
     EXPECT_EQ(image("A,1,0,0,0,,rw,,y\n"), "A,1,0,0,0,,rw,,y\n");
+    // Ctrl-Z, the end of a text file to old Windows programs, is a character like any other.
+    EXPECT_EQ(image("h\nA,1,0,0,0,\x1a,rw,,y\nB,2,0,0,0,,rw,,y\n"),
+              "h\nA,1,0,0,0,\x1a,rw,,y\nB,2,0,0,0,,rw,,y\n");
     EXPECT_NO_MESSAGES();
 }
 

@@ -1,6 +1,5 @@
 // The single-register handler chosen by ZAN_ORV_SWITCH_REG_HANDLER: one single transfer per
 // slice, only the words of named registers, its own cache.
-#include <cstdlib>
 #include <set>
 
 #include "registers/OrvNebu_DefaultRegisterHandler.h"
@@ -16,7 +15,7 @@ class SingleRegisterHandlerTest : public RegsFixture {
 protected:
     void SetUp() override {
         RegsFixture::SetUp();
-        setenv("ZAN_ORV_SWITCH_REG_HANDLER", "1", 1);
+        nebutest::setEnv("ZAN_ORV_SWITCH_REG_HANDLER", "1");
         ASSERT_EQ(initialize(0), ORVNEBU_OK);
         watchBus();
     }
@@ -111,7 +110,7 @@ TEST_F(SingleRegisterHandlerTest, EachHandlerClassKeepsItsOwnCache) {
     EXPECT_EQ(OrvNebu_SingleRegisterHandler::getHandlerCount(), 1u);
 
     // An empty value counts as unset: the next slave takes the default handler.
-    setenv("ZAN_ORV_SWITCH_REG_HANDLER", "", 1);
+    nebutest::setEnv("ZAN_ORV_SWITCH_REG_HANDLER", "");
     ASSERT_EQ(initialize(1), ORVNEBU_OK);
     EXPECT_NE(OrvNebu_DefaultRegisterHandler::findRegisterHandler(HANDLE, file), nullptr);
     EXPECT_NE(OrvNebu_DefaultRegisterHandler::findRegisterHandler(HANDLE, file),
@@ -126,7 +125,7 @@ TEST_F(SingleRegisterHandlerTest, EachHandlerClassKeepsItsOwnCache) {
 
     // Each slave gives its reference back to the class that supplied it, whatever the
     // variable says by then.
-    setenv("ZAN_ORV_SWITCH_REG_HANDLER", "1", 1);
+    nebutest::setEnv("ZAN_ORV_SWITCH_REG_HANDLER", "1");
     ASSERT_EQ(terminate(1), ORVNEBU_OK);
     EXPECT_EQ(OrvNebu_DefaultRegisterHandler::getHandlerCount(), 0u);
     EXPECT_EQ(OrvNebu_DefaultRegisterHandler::findRegisterHandler(HANDLE, file), nullptr);

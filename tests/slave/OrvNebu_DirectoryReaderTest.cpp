@@ -100,6 +100,12 @@ TEST_F(DirectoryReaderTest, LinesFirstMatchWinsShortLinesSkippedLongLinesCut) {
                            "1,1,1,,r.csv\r\n",
                            1, 1),
               "r.csv");
+    // Ctrl-Z, the end of a text file to old Windows programs, is a character like any other.
+    EXPECT_EQ(registersFor("slave_type,orv_drv_ver_min,orv_drv_ver_max,registers,parameters\n"
+                           "2,1,1,\x1a.csv,\n"
+                           "1,1,1,after.csv,\n",
+                           1, 1),
+              "after.csv");
     EXPECT_NO_MESSAGES();
 }
 
@@ -146,6 +152,14 @@ TEST_F(DirectoryReaderTest, RegisterFileNameKeepsItsBlanks) {
                              "0x11,1,1, regs.csv,\n"),
               ORVNEBU_FAILED);
     EXPECT_MESSAGE(256, "Unable to open OrvNebu register file: " + data_.dir() + " regs.csv");
+    // Windows would open regs.csv for these names: the plug-in does not, there either.
+    for (const std::string name : {"regs.csv  ", "regs.csv."}) {
+        EXPECT_EQ(initializeWith("slave_type,orv_drv_ver_min,orv_drv_ver_max,registers,parameters\n"
+                                 "0x11,1,1," +
+                                 name + ",\n"),
+                  ORVNEBU_FAILED);
+        EXPECT_MESSAGE(256, "Unable to open OrvNebu register file: " + data_.dir() + name);
+    }
 }
 
 // The class of the slave a creation function builds from the demo files of that class.

@@ -1,12 +1,9 @@
-// Runs the built nebu program as a user would and collects its output and exit status.
+// Runs the built nebu program as a user would and collects its output and exit status; the
+// few system calls the tests need (a fresh folder, an environment variable), on POSIX systems
+// and Windows alike.
 #pragma once
 
-#include <sys/wait.h>
-
-#include <cstdio>
 #include <filesystem>
-#include <fstream>
-#include <iterator>
 #include <string>
 #include <vector>
 
@@ -18,33 +15,28 @@ struct Result {
     std::string err;
 };
 
-inline std::string quote(const std::string& text) {
-    std::string q = "'";
-    for (char c : text) q += c == '\'' ? std::string("'\\''") : std::string(1, c);
-    return q + "'";
-}
+std::string readFile(const std::filesystem::path& path);
 
-inline std::string readFile(const std::filesystem::path& path) {
-    std::ifstream in(path, std::ios::binary);
-    return std::string(std::istreambuf_iterator<char>(in), std::istreambuf_iterator<char>());
-}
+// A new empty folder in the system's temporary folder, its name starting with prefix.
+std::filesystem::path makeTempDir(const std::string& prefix);
 
-// nebu with the arguments, standard input from stdinPath, standard error kept in stderrPath.
-inline Result runNebu(const std::vector<std::string>& args, const std::string& stdinPath,
-                      const std::filesystem::path& stderrPath) {
-    std::string command = quote(NEBU_CONSOLE_PATH);
-    for (const auto& arg : args) command += " " + quote(arg);
-    command += " <" + quote(stdinPath) + " 2>" + quote(stderrPath.string());
-    Result result;
-    FILE* pipe = popen(command.c_str(), "r");
-    if (pipe == nullptr) return result;
-    char buffer[4096];
-    size_t n;
-    while ((n = fread(buffer, 1, sizeof buffer, pipe)) > 0) result.out.append(buffer, n);
-    const int wait = pclose(pipe);
-    result.status = WIFEXITED(wait) ? WEXITSTATUS(wait) : -1;
-    result.err = readFile(stderrPath);
-    return result;
-}
+// An empty value is a set variable on POSIX systems but none on Windows: use unsetEnv for
+// "not set".
+void setEnv(const char* name, const char* value);
+void unsetEnv(const char* name);
+
+// Runs program with args (no shell), standard input from in, standard output and error into
+// files (one file for both when the paths are equal), in folder cwd (the current one when
+// empty). Returns the exit status, -1 when the program could not run.
+int runProgram(const std::string& program, const std::vector<std::string>& args,
+               const std::filesystem::path& in, const std::filesystem::path& out,
+               const std::filesystem::path& err, const std::filesystem::path& cwd = {});
+
+// nebu with the arguments, standard input from stdinPath; standard error goes through the file
+// stderrPath, standard output through stderrPath + ".stdout" (error merged into it when
+// mergeErr).
+Result runNebu(const std::vector<std::string>& args, const std::filesystem::path& stdinPath,
+               const std::filesystem::path& stderrPath, const std::filesystem::path& cwd = {},
+               bool mergeErr = false);
 
 }  // namespace nebutest

@@ -2,7 +2,6 @@
 // for the slave calls used by the slave and register tests.
 #pragma once
 
-#include <cstdlib>
 #include <initializer_list>
 #include <string>
 #include <utility>
@@ -55,7 +54,7 @@ protected:
 
     void SetUp() override {
         TestHost::SetUp();
-        unsetenv("ZAN_ORV_SWITCH_REG_HANDLER");
+        nebutest::unsetEnv("ZAN_ORV_SWITCH_REG_HANDLER");
         data_.write("orvnebu_directory.csv", DIRECTORY);
         data_.write("regs.csv", REGS);
         data_.write("chain.csv", CHAIN_REGS);
@@ -64,7 +63,7 @@ protected:
     }
 
     void TearDown() override {
-        unsetenv("ZAN_ORV_SWITCH_REG_HANDLER");
+        nebutest::unsetEnv("ZAN_ORV_SWITCH_REG_HANDLER");
         TestHost::TearDown();
     }
 

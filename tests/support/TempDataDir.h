@@ -1,19 +1,15 @@
 // A throwaway data directory for tests that need their own definition files.
 #pragma once
 
-#include <cstdlib>
 #include <filesystem>
 #include <fstream>
 #include <string>
 
+#include "support/NebuRun.h"
+
 class TempDataDir {
 public:
-    TempDataDir() {
-        std::string pattern =
-            (std::filesystem::temp_directory_path() / "nebu-data-XXXXXX").string();
-        if (mkdtemp(pattern.data()) == nullptr) throw std::runtime_error("mkdtemp failed");
-        path_ = pattern;
-    }
+    TempDataDir() : path_(nebutest::makeTempDir("nebu-data-").string()) {}
     ~TempDataDir() {
         std::error_code ignored;
         std::filesystem::remove_all(path_, ignored);

@@ -227,6 +227,8 @@ TEST(PllLineRateChoiceString, FormatAndReading) {
     std::string huge;
     OrvNebu_PllLineRateParamAction::makeLineRateChoiceString(1e300, 1, 1, 1, huge);
     EXPECT_EQ(301u + 4u + 22u, huge.size()) << huge;
+    // Every digit of the double, not 17 and zeros (the C runtime of old Windows).
+    EXPECT_EQ("1000000000000000052504760255204420248704", huge.substr(0, 40));
     EXPECT_EQ(" FB=1, REF=1, DIVSEL=1", huge.substr(305));
 
     uint64_t fb = 9, ref = 9, divsel = 9;

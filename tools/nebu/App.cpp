@@ -67,7 +67,8 @@ int runNebu(int argc, char** argv, std::istream& in, std::ostream& out, std::ost
         std::ifstream scriptFile;
         const bool scriptFromStdin = options.script == "-";
         if (!options.script.empty() && !scriptFromStdin) {
-            scriptFile.open(options.script);
+            // Binary: Windows' text mode would end a script at a Ctrl-Z; lines lose their CR.
+            scriptFile.open(options.script, std::ios::binary);
             if (!scriptFile) throw UsageError("cannot open script " + options.script);
         }
         auto board =

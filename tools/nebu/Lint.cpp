@@ -114,7 +114,8 @@ public:
 
     // False when the file cannot be opened.
     bool read(Report& report) {
-        std::ifstream in(regFilename_, std::ios::in);
+        std::ifstream in;
+        OrvNebu_CsvText::openFile(in, regFilename_);
         if (!in.is_open()) return false;
         std::string line;
         if (!std::getline(in, line)) return true;
@@ -413,7 +414,8 @@ bool isDirectory(const std::string& path) {
 }
 
 bool canOpen(const std::string& path) {
-    std::ifstream in(path);
+    std::ifstream in;
+    OrvNebu_CsvText::openFile(in, path);
     return in.is_open() && !isDirectory(path);
 }
 
@@ -463,7 +465,8 @@ private:
             }
             return false;
         }
-        std::ifstream in(directoryFile_, std::ios::in);
+        std::ifstream in;
+        OrvNebu_CsvText::openFile(in, directoryFile_);
         std::string line;
         std::getline(in, line);
         stripCR(line);
@@ -686,7 +689,13 @@ int runLint(const std::vector<std::string>& args, const std::string& defaultData
         err << "nebu: lint: no data directory '" << dataDir << "'" << std::endl;
         return 2;
     }
-    if (dataDir.back() != '/') dataDir += '/';
+#if defined(_WIN32)
+    const bool separated = dataDir.back() == '/' || dataDir.back() == '\\';
+#else
+    const bool separated = dataDir.back() == '/';
+#endif
+    // '/' joins on Windows too, as the stand-in host joins the data directory.
+    if (!separated) dataDir += '/';
 
     const LintResult result = lintDataDir(dataDir);
     for (const LintProblem& p : result.problems) {

@@ -2,6 +2,7 @@
 #include <iostream>
 
 #if defined(_WIN32)
+#include <fcntl.h>
 #include <io.h>
 #include <stdio.h>
 #else
@@ -13,6 +14,9 @@
 int main(int argc, char** argv) {
 #if defined(_WIN32)
     const bool terminal = _isatty(_fileno(stdin)) != 0;
+    // Line ends as on every other platform: the output is the same, byte for byte.
+    _setmode(_fileno(stdout), _O_BINARY);
+    _setmode(_fileno(stderr), _O_BINARY);
 #else
     const bool terminal = isatty(STDIN_FILENO) != 0;
 #endif
