@@ -2,6 +2,9 @@
 // a stream that swallows output, the demo data and board, and a fresh stand-in host per run.
 #pragma once
 
+#include <sys/stat.h>
+#include <unistd.h>
+
 #include <cstdint>
 #include <cstdio>
 #include <cstdlib>
@@ -11,11 +14,10 @@
 #include <ostream>
 #include <sstream>
 #include <streambuf>
-#include <sys/stat.h>
-#include <unistd.h>
 #include <string>
 #include <utility>
 
+#include "base/OrvNebu_FileProblem.h"
 #include "hostsim/Sim.h"
 #include "hostsim/board/Board.h"
 
@@ -86,13 +88,35 @@ inline std::string demoDataDir() { return std::string(NEBU_FUZZ_DATA_DIR) + "/";
 inline std::string demoFile(const std::string& name) { return demoDataDir() + name; }
 
 // Stops the program on a broken promise of the code under test, so the fuzzer reports it.
-#define NEBU_FUZZ_CHECK(cond)                                                         \
-    do {                                                                              \
-        if (!(cond)) {                                                                \
+#define NEBU_FUZZ_CHECK(cond)                                                             \
+    do {                                                                                  \
+        if (!(cond)) {                                                                    \
             std::fprintf(stderr, "%s:%d: check failed: %s\n", __FILE__, __LINE__, #cond); \
-            std::abort();                                                             \
-        }                                                                             \
+            std::abort();                                                                 \
+        }                                                                                 \
     } while (0)
+
+// What the definition-file reader promises of the problems it returns, and that the plug-in's
+// reading (which stops at the first refusal) and the file tools' (which read on) agree on it.
+template <class File>
+void checkBothReadings(const std::string& path) {
+    const File plugin(path);
+    const File tools(path, File::EVERY_PROBLEM);
+    const OrvRT::OrvNebu_FileProblem* first =
+        OrvRT::OrvNebu_FileProblem::firstRefusal(plugin.problems());
+    const OrvRT::OrvNebu_FileProblem* same =
+        OrvRT::OrvNebu_FileProblem::firstRefusal(tools.problems());
+    NEBU_FUZZ_CHECK((first == nullptr) == (same == nullptr));
+    if (first != nullptr) {
+        NEBU_FUZZ_CHECK(first == &plugin.problems().back());
+        NEBU_FUZZ_CHECK(first->line == same->line && first->text == same->text);
+    }
+    for (const OrvRT::OrvNebu_FileProblem& p : tools.problems()) {
+        NEBU_FUZZ_CHECK(p.file == path && !p.text.empty());
+        NEBU_FUZZ_CHECK((p.severity == OrvRT::OrvNebu_FileProblem::SEVERITY_WARNING) ==
+                        !p.refusesFile());
+    }
+}
 
 // The board of a board file text as loaded, without parsing the text on every run: a copy of
 // the board loaded the first time.
@@ -114,8 +138,7 @@ public:
         : HostRun(freshBoard(boardJson), dataDir) {}
     HostRun(std::shared_ptr<OrvSim::Board> board, const std::string& dataDir) {
         OrvSim::resetHost();
-        OrvSim::setMessageSink(
-            [this](uint32_t, uint32_t, const std::string&) { ++messages_; });
+        OrvSim::setMessageSink([this](uint32_t, uint32_t, const std::string&) { ++messages_; });
         OrvSim::setBoard(std::move(board));
         OrvSim::setDataDir(dataDir);
     }

@@ -1,7 +1,7 @@
 // Fuzzes the exported functions as a host would call them: a random sequence of calls with
 // fuzzed slave references, register and parameter names and values, raw reads and writes and
-// bus-level calls, sessions ended in between, against a small board with the demo data. Every call must
-// return OK or FAILED with a report, and a successful raw read must hand back its digits.
+// bus-level calls, sessions ended in between, against a small board with the demo data. Every call
+// must return OK or FAILED with a report, and a successful raw read must hand back its digits.
 #include <fuzzer/FuzzedDataProvider.h>
 
 #include <cctype>
@@ -46,16 +46,35 @@ const char* const BOARD =
 using Map = OrvRT::Orv_HashMapCStr;
 
 const char* const NAMES[] = {
-    "CTRL_ENABLE", "CTRL_MODE", "CTRL_CLK_DIV", "SCRATCH", "EVENT_COUNT", "GPIO_OUT",
-    "GPIO_IN_MIRRORED", "PLL_DIVSEL_FB0", "PLL_DIVSEL_REF0", "MAX_LINERATE", "LANE_MAP",
-    "TXUSRCLK_FREQ_TUNE0", "DUAL_NUMBER", "mode", "clock_divider", "loopback0", "line_rate0",
-    "line_rate1", "line_rate", "refclk_freq0", "refclk_freq1", "refclk_freq", "sysclk_freq",
-    "txusrclk0_freq", "rxrecclk0_freq", "refclk_source", "tx_data_width0", "test_pattern",
-    "refclk_input", "slave_type", "orv_drv_ver", ""};
-const char* const VALUES[] = {
-    "0", "1", "FFFF", "0x12", "", "run", "off", "self_test", "2500.000 FB=2, REF=1, DIVSEL=1",
-    "1250.000 FB=4, REF=2, DIVSEL=2", "125", "50", "156.25", "-1", "1e400", "G", "0xFFFFFFFFFFFFFFFFF",
-    "FFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFF", " 12 ", "20", "3125"};
+    "CTRL_ENABLE",     "CTRL_MODE",     "CTRL_CLK_DIV",     "SCRATCH",
+    "EVENT_COUNT",     "GPIO_OUT",      "GPIO_IN_MIRRORED", "PLL_DIVSEL_FB0",
+    "PLL_DIVSEL_REF0", "MAX_LINERATE",  "LANE_MAP",         "TXUSRCLK_FREQ_TUNE0",
+    "DUAL_NUMBER",     "mode",          "clock_divider",    "loopback0",
+    "line_rate0",      "line_rate1",    "line_rate",        "refclk_freq0",
+    "refclk_freq1",    "refclk_freq",   "sysclk_freq",      "txusrclk0_freq",
+    "rxrecclk0_freq",  "refclk_source", "tx_data_width0",   "test_pattern",
+    "refclk_input",    "slave_type",    "orv_drv_ver",      ""};
+const char* const VALUES[] = {"0",
+                              "1",
+                              "FFFF",
+                              "0x12",
+                              "",
+                              "run",
+                              "off",
+                              "self_test",
+                              "2500.000 FB=2, REF=1, DIVSEL=1",
+                              "1250.000 FB=4, REF=2, DIVSEL=2",
+                              "125",
+                              "50",
+                              "156.25",
+                              "-1",
+                              "1e400",
+                              "G",
+                              "0xFFFFFFFFFFFFFFFFF",
+                              "FFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFF",
+                              " 12 ",
+                              "20",
+                              "3125"};
 
 class Sequence {
 public:
@@ -81,10 +100,14 @@ private:
     ORV_SLAVE_REF ref() { return ORV_SLAVE_REF{device(), chain(), slave()}; }
     uint32_t address() {
         switch (in_.ConsumeIntegralInRange<int>(0, 3)) {
-            case 0: return in_.ConsumeIntegralInRange<uint32_t>(0, 0x40);
-            case 1: return in_.ConsumeIntegralInRange<uint32_t>(0x1FFE0, 0x1FFFF);
-            case 2: return in_.ConsumeIntegralInRange<uint32_t>(0, 0x1FFFF);
-            default: return in_.ConsumeIntegral<uint32_t>();
+            case 0:
+                return in_.ConsumeIntegralInRange<uint32_t>(0, 0x40);
+            case 1:
+                return in_.ConsumeIntegralInRange<uint32_t>(0x1FFE0, 0x1FFFF);
+            case 2:
+                return in_.ConsumeIntegralInRange<uint32_t>(0, 0x1FFFF);
+            default:
+                return in_.ConsumeIntegral<uint32_t>();
         }
     }
     uint32_t* status(uint32_t& word) { return in_.ConsumeBool() ? &word : nullptr; }
@@ -116,14 +139,20 @@ struct HostMap {
 void Sequence::step() {
     uint32_t word = 0;
     switch (in_.ConsumeIntegralInRange<int>(0, 27)) {
-        case 0: check(OrvNebu_initialize(handle(), ref())); break;
-        case 1: check(OrvNebu_terminate(handle(), ref())); break;
+        case 0:
+            check(OrvNebu_initialize(handle(), ref()));
+            break;
+        case 1:
+            check(OrvNebu_terminate(handle(), ref()));
+            break;
         case 2: {
             HostMap m(map(true));
             check(OrvNebu_getBusInfo(handle(), device(), chain(), &m.handle));
             break;
         }
-        case 3: check(OrvNebu_getSlaveCount(handle(), device(), chain(), &word)); break;
+        case 3:
+            check(OrvNebu_getSlaveCount(handle(), device(), chain(), &word));
+            break;
         case 4: {
             const uint32_t n = in_.ConsumeIntegralInRange<uint32_t>(0, 10);
             std::vector<uint32_t> handles(n, 0xFFFFFFFFu);
@@ -188,12 +217,24 @@ void Sequence::step() {
                                             n == 0 ? nullptr : errors.data(), n));
             break;
         }
-        case 14: check(OrvNebu_clearBusErrorStatus(handle(), device(), chain())); break;
-        case 15: check(OrvNebu_resetBus(handle(), device(), chain())); break;
-        case 16: check(OrvNebu_testSlaveInterface(handle(), ref(), &word)); break;
-        case 17: check(OrvNebu_resetSlave(handle(), ref())); break;
-        case 18: check(OrvNebu_disableSlave(handle(), ref())); break;
-        case 19: check(OrvNebu_enableSlave(handle(), ref())); break;
+        case 14:
+            check(OrvNebu_clearBusErrorStatus(handle(), device(), chain()));
+            break;
+        case 15:
+            check(OrvNebu_resetBus(handle(), device(), chain()));
+            break;
+        case 16:
+            check(OrvNebu_testSlaveInterface(handle(), ref(), &word));
+            break;
+        case 17:
+            check(OrvNebu_resetSlave(handle(), ref()));
+            break;
+        case 18:
+            check(OrvNebu_disableSlave(handle(), ref()));
+            break;
+        case 19:
+            check(OrvNebu_enableSlave(handle(), ref()));
+            break;
         case 20: {
             uint32_t buffer = 0;
             check(OrvNebu_singleSlaveRead(handle(), ref(), address(), &buffer, status(word)));
@@ -204,15 +245,14 @@ void Sequence::step() {
                                            in_.ConsumeIntegral<uint32_t>(), status(word)));
             break;
         case 22:
-            check(OrvNebu_singleSlaveReadModifyWrite(handle(), ref(), address(),
-                                                     in_.ConsumeIntegral<uint32_t>(),
-                                                     in_.ConsumeIntegral<uint32_t>(), status(word)));
+            check(OrvNebu_singleSlaveReadModifyWrite(
+                handle(), ref(), address(), in_.ConsumeIntegral<uint32_t>(),
+                in_.ConsumeIntegral<uint32_t>(), status(word)));
             break;
         case 23: {
             uint32_t rd = 0;
-            check(OrvNebu_singleSlaveWriteAndInspect(handle(), ref(), address(),
-                                                     in_.ConsumeIntegral<uint32_t>(), &rd,
-                                                     status(word)));
+            check(OrvNebu_singleSlaveWriteAndInspect(
+                handle(), ref(), address(), in_.ConsumeIntegral<uint32_t>(), &rd, status(word)));
             break;
         }
         case 24: {

@@ -4,6 +4,7 @@
 #include <string>
 
 #include "FuzzSupport.h"
+#include "base/OrvNebu_DirectoryFile.h"
 #include "slave/OrvNebu_DirectoryReader.h"
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
@@ -25,5 +26,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
     } catch (...) {
         // Reported on the session channel.
     }
+    // Not the whole data directory: the names in a fuzzed file may lead anywhere.
+    checkBothReadings<OrvRT::OrvNebu_DirectoryFile>(dir.path("orvnebu_directory.csv"));
     return 0;
 }

@@ -5,6 +5,8 @@
 #include <vector>
 
 #include "FuzzSupport.h"
+#include "base/OrvNebu_DataDirectory.h"
+#include "base/OrvNebu_ParamFile.h"
 #include "host/OrvCore.h"
 #include "orvnebu/orvnebu.h"
 #include "params/OrvNebu_DefaultParamReader.h"
@@ -47,6 +49,9 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
     } catch (...) {
         // Reported on the session channel; the exported calls below meet it again.
     }
+    checkBothReadings<OrvRT::OrvNebu_ParamFile>(dir.path("fuzz_params.csv"));
+    // The file tools' reading of the whole directory: the checks across lines and files.
+    (void)OrvRT::OrvNebu_DataDirectory(dir.dir()).problems();
     // Printing caches the file under session 0; its end must forget it.
     OrvSim::endSession(0);
     NEBU_FUZZ_CHECK(OrvRT::OrvNebu_DefaultParamReader::cachedFileCount(0) == 0);

@@ -5,6 +5,8 @@
 #include <vector>
 
 #include "FuzzSupport.h"
+#include "base/OrvNebu_DataDirectory.h"
+#include "base/OrvNebu_RegisterFile.h"
 #include "host/OrvCore.h"
 #include "orvnebu/orvnebu.h"
 #include "registers/OrvNebu_DefaultRegisterHandler.h"
@@ -30,10 +32,13 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
     HostRun run(BOARD, dir.dir());
     try {
         OrvRT::OrvNebu_DefaultRegisterHandler::readAndPrint(1, dir.path("fuzz_regs.csv"),
-                                                           nullStream());
+                                                            nullStream());
     } catch (...) {
         // Reported on the session channel; the exported calls below meet it again.
     }
+    checkBothReadings<OrvRT::OrvNebu_RegisterFile>(dir.path("fuzz_regs.csv"));
+    // The file tools' reading of the whole directory: the checks across lines and files.
+    (void)OrvRT::OrvNebu_DataDirectory(dir.dir()).problems();
 
     const ORV_SLAVE_REF ref{0, 1, 0};
     if (!run.check(OrvNebu_initialize(1, ref))) return 0;
@@ -57,7 +62,8 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
     }
     // All of them at once, as read.
     ORV_HASHMAP_HANDLE all = OrvContainer_hashmapCStr_new();
-    *static_cast<OrvRT::Orv_HashMapCStr*>(all) = OrvRT::Orv_HashMapCStr(entries.begin(), entries.end());
+    *static_cast<OrvRT::Orv_HashMapCStr*>(all) =
+        OrvRT::Orv_HashMapCStr(entries.begin(), entries.end());
     run.check(OrvNebu_setRegisters(1, ref, &all));
     OrvContainer_hashmapCStr_delete(all);
     OrvContainer_hashmapCStr_delete(regs);

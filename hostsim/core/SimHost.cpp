@@ -43,9 +43,13 @@ std::shared_ptr<Board> getBoard() {
 void endSession(uint32_t handle) {
     const std::shared_ptr<JtagSession> session = JtagSession::get(handle);
     notifySessionEnded(handle);
+    // A call still running in the session finishes first: its cores and queued writes must not
+    // go from under it. Listeners are told before, so that one may wait for that call.
+    session->lockTarget(UINT32_MAX);
     for (OrvRT::Orv_Core* core : takeSessionCores(handle)) delete core;
     session->end();
     JtagSession::forget(handle);
+    session->unlockTarget();
 }
 
 void resetHost() {

@@ -13,6 +13,7 @@
 #include "orvnebu/orvnebu.h"
 #include "slave/OrvNebu_Slave.h"
 #include "slave/OrvNebu_SlaveFactory.h"
+#include "transceiver/OrvNebu_TransceiverClasses.h"
 
 using namespace OrvRT;
 
@@ -105,7 +106,8 @@ ORVNEBU_API uint32_t ORVNEBU_CALL OrvNebu_initialize(uint32_t handle, ORV_SLAVE_
                 throw std::logic_error(slaveText(slaveRef) +
                                        ", is not a valid OrvNebu Slave core.");
             }
-            slave = OrvNebu_SlaveFactory::create(handle, slaveRef, mapOf(&infoHandle));
+            slave = OrvNebu_SlaveFactory::create(handle, slaveRef, mapOf(&infoHandle),
+                                                 OrvNebu_TransceiverClasses::slaveClasses());
         }
         // The slave's init has reported why it failed; the call must not look successful.
         if (slave == nullptr) throw Orv_AbortException();

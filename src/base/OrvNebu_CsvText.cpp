@@ -1,6 +1,8 @@
 // Comma split and saturating C-style number readings.
 #include "base/OrvNebu_CsvText.h"
 
+#include <boost/algorithm/string/classification.hpp>
+#include <boost/algorithm/string/split.hpp>
 #include <cctype>
 
 namespace OrvRT {
@@ -41,18 +43,23 @@ size_t skipBlanksAndSign(const std::string& text, bool& negative) {
 }  // namespace
 
 void OrvNebu_CsvText::splitCommas(const std::string& line, std::vector<std::string>& fields) {
-    size_t count = 0;
-    size_t start = 0;
-    for (;;) {
-        size_t comma = line.find(',', start);
-        size_t end = comma == std::string::npos ? line.size() : comma;
-        if (count == fields.size()) fields.emplace_back();
-        fields[count].assign(line, start, end - start);
-        ++count;
-        if (comma == std::string::npos) break;
-        start = comma + 1;
-    }
-    fields.resize(count);
+    boost::algorithm::split(fields, line, boost::algorithm::is_any_of(","),
+                            boost::algorithm::token_compress_off);
+}
+
+std::string OrvNebu_CsvText::hexText(uint32_t value) {
+    static const char* const DIGITS = "0123456789abcdef";
+    std::string text;
+    do {
+        text.insert(text.begin(), DIGITS[value & 0xFu]);
+        value >>= 4;
+    } while (value != 0);
+    return text;
+}
+
+bool OrvNebu_CsvText::hasInnerCR(const std::string& line) {
+    const size_t cr = line.find('\r');
+    return cr != std::string::npos && cr + 1 < line.size();
 }
 
 int32_t OrvNebu_CsvText::decimalToInt32(const std::string& text) {

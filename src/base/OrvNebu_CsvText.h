@@ -11,8 +11,16 @@ namespace OrvRT {
 
 class OrvNebu_CsvText {
 public:
-    // Splits at every comma; adjacent commas give empty fields. Reuses fields' storage.
+    // Splits at every comma; adjacent commas give empty fields.
     static void splitCommas(const std::string& line, std::vector<std::string>& fields);
+
+    // Lower-case hexadecimal digits without prefix or leading zeros ("0" for zero), as the
+    // readers write addresses and slave types.
+    static std::string hexText(uint32_t value);
+
+    // A carriage return before the end of the line: a file whose lines end in CR alone, read
+    // as one line.
+    static bool hasInnerCR(const std::string& line);
 
     // Leading blanks, optional sign, decimal digits; 0 without digits. Values beyond the
     // 32-bit range saturate at INT32_MIN/INT32_MAX.

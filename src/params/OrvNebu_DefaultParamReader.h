@@ -10,8 +10,8 @@
 #include <vector>
 
 #include "host/OrvJtag.h"
+#include "params/OrvNebu_ParamAction.h"
 #include "params/OrvNebu_ParamChoiceAction.h"
-#include "slave/OrvNebu_ParamAction.h"
 
 namespace OrvRT {
 
@@ -83,7 +83,6 @@ private:
     // Returns the actions now cached under the key.
     ChoiceActions* addToStorage(uint32_t handle, const std::string& fileName,
                                 std::unique_ptr<ChoiceActions> actions);
-    bool parseLine(ChoiceActions* actions, uint32_t lineNumber, const std::string& line);
     std::unique_ptr<ChoiceActions> readParamsFromFile();
     ChoiceActions* getParams();
 

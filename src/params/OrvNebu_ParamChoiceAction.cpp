@@ -24,7 +24,7 @@ OrvNebu_ParamChoiceAction::OrvNebu_ParamChoiceAction(const std::string& paramNam
 
 void OrvNebu_ParamChoiceAction::addChoice(const std::string& choiceName, uint32_t index) {
     if (static_cast<uint64_t>(index) != static_cast<uint64_t>(choiceList_.size())) {
-        throw std::logic_error("choice_index out-of-order");
+        throw std::logic_error(OrvNebu_ParamFile::INDEX_OUT_OF_ORDER);
     }
     choiceList_.emplace_back(choiceName);
 }

@@ -8,15 +8,16 @@
 #include <string>
 #include <vector>
 
+#include "base/OrvNebu_ParamFile.h"
+#include "params/OrvNebu_ParamAction.h"
 #include "params/OrvNebu_ParamChoice.h"
-#include "slave/OrvNebu_ParamAction.h"
 
 namespace OrvRT {
 
 class OrvNebu_ParamChoiceAction : public OrvNebu_ParamAction {
 public:
     // Choice actions of a parameter file get this plus the file line that starts them.
-    static constexpr uint32_t START_PRIORITY = 10000;
+    static constexpr uint32_t START_PRIORITY = OrvNebu_ParamFile::START_PRIORITY;
 
     OrvNebu_ParamChoiceAction(const std::string& paramName, uint32_t priority);
 

@@ -2,6 +2,7 @@
 #include "registers/OrvNebu_DefaultRegisterHandler.h"
 
 #include <algorithm>
+#include <stdexcept>
 #include <vector>
 
 #include "bus/OrvNebu_BusList.h"
@@ -53,7 +54,7 @@ void OrvNebu_DefaultRegisterHandler::getAddressRange(uint32_t* firstAddress, uin
     *firstAddress = 0xFFFFFFFFu;
     *lastAddress = 0;
     for (const auto& entry : *registers) {
-        const Register* reg = findRegisterMutable(entry.first);
+        const Register* reg = findRegister(entry.first);
         if (reg == nullptr) continue;
         *firstAddress = std::min(*firstAddress, reg->minAddress);
         *lastAddress = std::max(*lastAddress, reg->maxAddress);
@@ -85,6 +86,23 @@ void OrvNebu_DefaultRegisterHandler::setValue(const Register& reg, WordBlock& bl
     }
 }
 
+void OrvNebu_DefaultRegisterHandler::readBlock(uint32_t handle, const ORV_SLAVE_REF& slaveRef,
+                                               OrvNebu_Transaction& bus, WordBlock& block) const {
+    const uint32_t count = block.lastAddress - block.firstAddress + 1;
+    // Said in the words of the file: a burst the caller never asked for would not be.
+    if (count > OrvNebu_RegisterFile::MAX_BURST_WORDS) {
+        std::string first, last;
+        const std::string text = "Registers of " + regFilename_ + " span words 0x" +
+                                 Orv_NumberUtil::uLL2HexStr(block.firstAddress, first) + " to 0x" +
+                                 Orv_NumberUtil::uLL2HexStr(block.lastAddress, last) + " (" +
+                                 std::to_string(count) + " words): more than one burst moves (" +
+                                 std::to_string(OrvNebu_RegisterFile::MAX_BURST_WORDS) + ")";
+        throw std::logic_error(text);
+    }
+    block.words.assign(count, 0);
+    bus.burstSlaveRead(handle, slaveRef, block.firstAddress, 1, block.words.data(), count, nullptr);
+}
+
 void OrvNebu_DefaultRegisterHandler::getRegisters(uint32_t handle, const ORV_SLAVE_REF& slaveRef,
                                                   Orv_HashMapCStr* registers) {
     const OrvNebu_TransactionPtr bus =
@@ -92,23 +110,19 @@ void OrvNebu_DefaultRegisterHandler::getRegisters(uint32_t handle, const ORV_SLA
     WordBlock block;
     if (registers->empty()) {
         // A file without registers has nothing to read.
-        if (registerMap_.empty()) return;
-        block.firstAddress = minAddress_;
-        block.lastAddress = maxAddress_;
+        if (file_->registers().empty()) return;
+        block.firstAddress = file_->minAddress();
+        block.lastAddress = file_->maxAddress();
     } else {
         checkRegisterNames(handle, *registers);
         getAddressRange(&block.firstAddress, &block.lastAddress, registers);
     }
-    const uint32_t count = block.lastAddress - block.firstAddress + 1;
-    block.words.assign(count, 0);
-    bus->burstSlaveRead(handle, slaveRef, block.firstAddress, 1, block.words.data(), count,
-                        nullptr);
+    readBlock(handle, slaveRef, *bus, block);
     if (registers->empty()) {
-        for (const auto& entry : registerMap_)
+        for (const auto& entry : file_->registers())
             (*registers)[entry.first] = getValue(entry.second, block);
     } else {
-        for (auto& entry : *registers)
-            entry.second = getValue(*findRegisterMutable(entry.first), block);
+        for (auto& entry : *registers) entry.second = getValue(*findRegister(entry.first), block);
     }
 }
 
@@ -124,7 +138,7 @@ void OrvNebu_DefaultRegisterHandler::setRegisters(uint32_t handle, const ORV_SLA
     std::vector<std::pair<const Register*, std::string>> values;
     values.reserve(registers->size());
     for (const auto& entry : *registers) {
-        const Register* reg = findRegisterMutable(entry.first);
+        const Register* reg = findRegister(entry.first);
         std::string digits;
         toDigits(entry.second, *reg, digits);
         values.emplace_back(reg, std::move(digits));
@@ -132,13 +146,10 @@ void OrvNebu_DefaultRegisterHandler::setRegisters(uint32_t handle, const ORV_SLA
 
     WordBlock block;
     getAddressRange(&block.firstAddress, &block.lastAddress, registers);
-    const uint32_t count = block.lastAddress - block.firstAddress + 1;
-    block.words.assign(count, 0);
-    bus->burstSlaveRead(handle, slaveRef, block.firstAddress, 1, block.words.data(), count,
-                        nullptr);
+    readBlock(handle, slaveRef, *bus, block);
     for (const auto& v : values) setValue(*v.first, block, v.second);
-    bus->burstSlaveWrite(handle, slaveRef, block.firstAddress, 1, block.words.data(), count,
-                         nullptr);
+    bus->burstSlaveWrite(handle, slaveRef, block.firstAddress, 1, block.words.data(),
+                         static_cast<uint32_t>(block.words.size()), nullptr);
 }
 
 }  // namespace OrvRT

@@ -5,10 +5,13 @@
 #include <cstdint>
 #include <ostream>
 #include <string>
+#include <vector>
 
 #include "registers/OrvNebu_RegisterHandler.h"
 
 namespace OrvRT {
+
+class OrvNebu_Transaction;
 
 class OrvNebu_DefaultRegisterHandler : public OrvNebu_RegisterHandler {
 public:
@@ -46,6 +49,10 @@ private:
     };
 
     static Cache& cache();
+    // Sizes the block and fills it with one burst read; throws std::logic_error naming the file
+    // and the span when that is longer than one burst.
+    void readBlock(uint32_t handle, const ORV_SLAVE_REF& slaveRef, OrvNebu_Transaction& bus,
+                   WordBlock& block) const;
     // Widens first/last to the registers named in the map.
     void getAddressRange(uint32_t* firstAddress, uint32_t* lastAddress,
                          const Orv_HashMapCStr* registers) const;

@@ -1,17 +1,16 @@
-// Base of the register handlers: the register definition file (format, parsing, messages,
-// printed image), the in-memory register model, the bit mapping of slices, and the
-// reference-counted handler caches keyed by file name.
+// Base of the register handlers: a register definition file read into its register model
+// (the file and its model are the definition-file reader's), the reading failures reported on
+// the session channel, and the reference-counted handler caches keyed by file name.
 #pragma once
 
 #include <cstdint>
-#include <deque>
 #include <memory>
 #include <mutex>
 #include <ostream>
 #include <string>
 #include <unordered_map>
-#include <vector>
 
+#include "base/OrvNebu_RegisterFile.h"
 #include "host/OrvTypes.h"
 
 namespace OrvRT {
@@ -19,44 +18,9 @@ namespace OrvRT {
 class OrvNebu_RegisterHandler {
 public:
     static constexpr uint32_t SEVERITY_ERROR = 256;
-    static constexpr uint32_t SEVERITY_MALFORMED_LINE = 512;
-    // Bus addresses are 17 bits wide.
-    static constexpr uint32_t MAX_BUS_ADDRESS = 0x1FFFF;
-    static constexpr uint32_t HIGHEST_WORD_BIT = 31;
 
-    // One included line of a register file.
-    struct RegisterSlice {
-        std::string registerName;
-        uint32_t address = 0;
-        uint32_t order = 0;
-        uint32_t startBit = 0;  // word bit of the slice's least significant bit
-        uint32_t endBit = 0;    // word bit of the slice's most significant bit
-        std::string text6;
-        bool readable = false;
-        bool writable = false;
-        std::string text8;
-        bool included = true;
-        std::string trailer;  // ",..." from the line's last comma when it has 10+ columns
-
-        uint32_t width() const {
-            return (endBit > startBit ? endBit - startBit : startBit - endBit) + 1;
-        }
-        // Appends the slice's digits taken from word: bit endBit first, bit startBit last.
-        void appendDigits(uint32_t word, std::string& digits) const;
-        // Takes width() digits from digits[pos...] into value bits and clears their bits in
-        // keepMask, with the same mapping.
-        void mergeDigits(const std::string& digits, size_t pos, uint32_t& value,
-                         uint32_t& keepMask) const;
-    };
-
-    // All included lines of one name; slices in ascending order (equal orders in file order).
-    struct Register {
-        std::string name;
-        std::vector<RegisterSlice*> slices;
-        uint32_t totalWidth = 0;
-        uint32_t minAddress = 0xFFFFFFFFu;
-        uint32_t maxAddress = 0;
-    };
+    typedef OrvNebu_RegisterFile::RegisterSlice RegisterSlice;
+    typedef OrvNebu_RegisterFile::Register Register;
 
     virtual ~OrvNebu_RegisterHandler();
 
@@ -68,14 +32,16 @@ public:
                               Orv_HashMapCStr* registers) = 0;
     virtual std::string getRegFilename() const { return regFilename_; }
 
-    const std::string& getHeader() const { return header_; }
-    size_t getSliceCount() const { return slices_.size(); }
-    size_t getRegisterCount() const { return registerMap_.size(); }
+    // The file as read; null before the derived constructor read it.
+    const OrvNebu_RegisterFile* getFile() const { return file_.get(); }
+    size_t getRegisterCount() const { return file_->registers().size(); }
     // Lowest and highest address of all included lines (0xFFFFFFFF and 0 for none).
-    uint32_t getMinAddress() const { return minAddress_; }
-    uint32_t getMaxAddress() const { return maxAddress_; }
+    uint32_t getMinAddress() const { return file_->minAddress(); }
+    uint32_t getMaxAddress() const { return file_->maxAddress(); }
     // Null for an empty or unknown name.
-    const Register* findRegister(const std::string& name) const;
+    const Register* findRegister(const std::string& name) const {
+        return file_->findRegister(name);
+    }
 
     OrvNebu_RegisterHandler(const OrvNebu_RegisterHandler&) = delete;
     OrvNebu_RegisterHandler& operator=(const OrvNebu_RegisterHandler&) = delete;
@@ -95,14 +61,10 @@ protected:
     // Reads the file named by regFilename_. Reports and throws: a logic error when the file
     // cannot be opened, Orv_AbortException after a parse error.
     void readRegistersFromFile(uint32_t handle);
-    // False only for a line of fewer than 9 columns. Throws std::logic_error for a line whose
-    // numbers cannot be used.
-    bool parseLine(uint32_t lineNumber, const std::string& line);
     // Writes the file image back: header, then one line per slice in file order.
     void print(uint32_t handle, std::ostream& out) const;
     // Reports the first key that names no register and throws Orv_AbortException.
     void checkRegisterNames(uint32_t handle, const Orv_HashMapCStr& registers) const;
-    Register* findRegisterMutable(const std::string& name) const;
     // The value text as exactly totalWidth binary digits; throws std::logic_error for text
     // that is not hexadecimal.
     static void toDigits(const std::string& value, const Register& reg, std::string& digits);
@@ -127,17 +89,7 @@ protected:
     static void releaseToCache(Cache& cache);
 
     std::string regFilename_;
-    std::string header_;
-    // A deque keeps the slices where they are as it grows: registers point at them.
-    std::deque<RegisterSlice> slices_;
-    // Nodes stay put as the map grows, so slices may be reached through Register pointers.
-    std::unordered_map<std::string, Register> registerMap_;
-    uint32_t minAddress_ = 0xFFFFFFFFu;
-    uint32_t maxAddress_ = 0;
-
-private:
-    // Scratch of parseLine, kept to spare allocations on long files.
-    std::vector<std::string> columns_;
+    std::unique_ptr<const OrvNebu_RegisterFile> file_;
 };
 
 }  // namespace OrvRT

@@ -81,14 +81,14 @@ void OrvNebu_SingleRegisterHandler::getRegisters(uint32_t handle, const ORV_SLAV
     const OrvNebu_TransactionPtr bus =
         OrvNebu_BusList::getBusList()->getBus(handle, slaveRef.device, slaveRef.userChain);
     if (registers->empty()) {
-        for (const auto& entry : registerMap_) {
+        for (const auto& entry : file_->registers()) {
             (*registers)[entry.first] = getValue(handle, slaveRef, *bus, entry.second);
         }
         return;
     }
     checkRegisterNames(handle, *registers);
     for (auto& entry : *registers) {
-        entry.second = getValue(handle, slaveRef, *bus, *findRegisterMutable(entry.first));
+        entry.second = getValue(handle, slaveRef, *bus, *findRegister(entry.first));
     }
 }
 
@@ -101,7 +101,7 @@ void OrvNebu_SingleRegisterHandler::setRegisters(uint32_t handle, const ORV_SLAV
     std::vector<std::pair<const Register*, std::string>> values;
     values.reserve(registers->size());
     for (const auto& entry : *registers) {
-        const Register* reg = findRegisterMutable(entry.first);
+        const Register* reg = findRegister(entry.first);
         std::string digits;
         toDigits(entry.second, *reg, digits);
         values.emplace_back(reg, std::move(digits));

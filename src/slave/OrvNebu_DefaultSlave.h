@@ -7,7 +7,7 @@
 #include <string>
 #include <vector>
 
-#include "slave/OrvNebu_ParamAction.h"
+#include "params/OrvNebu_ParamAction.h"
 #include "slave/OrvNebu_Slave.h"
 
 namespace OrvRT {

@@ -4,7 +4,6 @@
 
 #include <cstdint>
 #include <string>
-#include <vector>
 
 #include "host/OrvTypes.h"
 
@@ -12,8 +11,6 @@ namespace OrvRT {
 
 class OrvNebu_DirectoryReader {
 public:
-    static constexpr uint32_t SEVERITY_ERROR = 256;
-
     // Fills entry from the first line matching the slave type and driver version, under the
     // header's (lower-case, trimmed) column names. True when a line matched. A file that
     // cannot be opened or whose header is unusable is reported, then Orv_AbortException.
@@ -25,19 +22,11 @@ private:
                             int32_t driverVersion);
 
     bool getResult(Orv_HashMapCStr& entry);
-    bool parseHeader(const std::string& line);
-    bool parseLine(uint32_t lineNumber, const std::string& line, Orv_HashMapCStr& entry);
 
-    std::vector<std::string> headerFields_;
     uint32_t handle_;
     std::string fileName_;
     int32_t slaveType_;
     int32_t driverVersion_;
-    int32_t slaveTypeColumn_ = -1;
-    int32_t minimumColumn_ = -1;
-    int32_t maximumColumn_ = -1;
-    int32_t highestKeyColumn_ = -1;
-    std::vector<std::string> fields_;
 };
 
 }  // namespace OrvRT

@@ -9,17 +9,6 @@
 
 namespace OrvRT {
 
-const OrvNebu_ClockFreqParamAction::Param2Reg OrvNebu_ClockFreqParamAction::OUT_PARAM_2_REG[] = {
-    {"txusrclk0_freq", "TXUSRCLK_FREQ_CNT0", "TXUSRCLK_FREQ_TUNE0"},
-    {"txusrclk1_freq", "TXUSRCLK_FREQ_CNT1", "TXUSRCLK_FREQ_TUNE1"},
-    {"txusrclk20_freq", "TXUSRCLK2_FREQ_CNT0", "TXUSRCLK2_FREQ_TUNE0"},
-    {"txusrclk21_freq", "TXUSRCLK2_FREQ_CNT1", "TXUSRCLK2_FREQ_TUNE1"},
-    {"rxusrclk0_freq", "RXUSRCLK_FREQ_CNT0", "RXUSRCLK_FREQ_TUNE0"},
-    {"rxusrclk1_freq", "RXUSRCLK_FREQ_CNT1", "RXUSRCLK_FREQ_TUNE1"},
-    {"rxusrclk20_freq", "RXUSRCLK2_FREQ_CNT0", "RXUSRCLK2_FREQ_TUNE0"},
-    {"rxusrclk21_freq", "RXUSRCLK2_FREQ_CNT1", "RXUSRCLK2_FREQ_TUNE1"},
-};
-
 namespace {
 std::logic_error outOfRange(const OrvNebu_CounterFreqParamAction::Param2Reg& row) {
     return std::logic_error(std::string("Cannot calculate ") + row.paramName +

@@ -9,8 +9,9 @@ namespace OrvRT {
 class OrvNebu_ClockFreqParamAction : public OrvNebu_CounterFreqParamAction {
 public:
     using Param2Reg = OrvNebu_CounterFreqParamAction::Param2Reg;
-    static const Param2Reg OUT_PARAM_2_REG[];
-    static constexpr uint32_t OUT_PARAM_COUNT = 8;
+    // The rows are the slave class table's, which the file tools read too.
+    static constexpr const Param2Reg* OUT_PARAM_2_REG = OrvNebu_SlaveClassTable::R2QRA_CLOCKS;
+    static constexpr uint32_t OUT_PARAM_COUNT = OrvNebu_SlaveClassTable::R2QRA_CLOCK_COUNT;
 
     OrvNebu_ClockFreqParamAction(OrvNebu_DefaultSlave* slave, uint32_t priority);
 

@@ -6,7 +6,8 @@
 #include <string>
 #include <vector>
 
-#include "slave/OrvNebu_ParamAction.h"
+#include "base/OrvNebu_SlaveClassTable.h"
+#include "params/OrvNebu_ParamAction.h"
 
 namespace OrvRT {
 
@@ -14,11 +15,7 @@ class OrvNebu_DefaultSlave;
 
 class OrvNebu_CounterFreqParamAction : public OrvNebu_ParamAction {
 public:
-    struct Param2Reg {
-        const char* paramName;
-        const char* countRegName;
-        const char* tuneRegName;
-    };
+    typedef OrvNebu_SlaveClassTable::ClockCounter Param2Reg;
     static constexpr const char* IN_PARAM_NAME = "sysclk_freq";
 
     const std::string& getParamName() override { return names_.front(); }

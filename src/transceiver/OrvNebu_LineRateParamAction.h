@@ -6,7 +6,7 @@
 #include <string>
 #include <vector>
 
-#include "slave/OrvNebu_ParamAction.h"
+#include "params/OrvNebu_ParamAction.h"
 
 namespace OrvRT {
 

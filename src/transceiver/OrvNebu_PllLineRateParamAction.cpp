@@ -100,7 +100,11 @@ void OrvNebu_PllLineRateParamAction::getChoices(Orv_HashMapCStr* params,
     }
     const double refclk = OrvNebu_XcvrNumber::readDouble(found->second);
     choices.clear();
+    addRates(refclk, readDividerChoices(), choices);
+}
 
+OrvNebu_PllLineRateParamAction::DividerChoices
+OrvNebu_PllLineRateParamAction::readDividerChoices() {
     const uint32_t handle = slave_->getOwnerHandle();
     const ORV_SLAVE_REF slaveRef = slave_->getSlaveRef();
     Orv_HashMapCStr registers(100);
@@ -111,43 +115,43 @@ void OrvNebu_PllLineRateParamAction::getChoices(Orv_HashMapCStr* params,
     Orv_HashMapCStr factorValues(100);
     for (const std::string& name : factorParams_) factorValues[name];
     slave_->getParameters(handle, slaveRef, &factorValues);
-    const uint64_t factor = dividerFactor(factorValues);
 
-    std::vector<std::string> lists[3];
+    DividerChoices d;
+    d.factor = dividerFactor(factorValues);
     const std::string* dividerNames[3] = {&fbName_, &refName_, &divselName_};
     for (int i = 0; i < 3; ++i) {
         Orv_HashMapCStr request(100);
         request[*dividerNames[i]];
-        slave_->getParameterChoices(handle, slaveRef, &request, &lists[i]);
+        slave_->getParameterChoices(handle, slaveRef, &request, &d.lists[i]);
     }
+    d.maxRegister = Orv_NumberUtil::hexStr2ULL(registers[MAX_LINERATE]);
+    d.oversampled = oversampling_ && Orv_NumberUtil::hexStr2ULL(registers[TX_OVERSAMPLE_MODE]) != 0;
+    return d;
+}
 
-    const uint64_t maxRegister = Orv_NumberUtil::hexStr2ULL(registers[MAX_LINERATE]);
-    const double maximum = static_cast<double>(maxRegister) / 1000000.0;
-    const bool oversampled =
-        oversampling_ && Orv_NumberUtil::hexStr2ULL(registers[TX_OVERSAMPLE_MODE]) != 0;
-
+void OrvNebu_PllLineRateParamAction::addRates(double refclk, const DividerChoices& d,
+                                              std::vector<std::string>& choices) const {
+    const double maximum = static_cast<double>(d.maxRegister) / 1000000.0;
     std::string text;
-    for (const std::string& fbText : lists[0]) {
+    for (const std::string& fbText : d.lists[0]) {
         const uint64_t fb = Orv_NumberUtil::decStr2ULL(fbText);
-        for (const std::string& refText : lists[1]) {
+        for (const std::string& refText : d.lists[1]) {
             const uint64_t ref = Orv_NumberUtil::decStr2ULL(refText);
             // A divider of 0 divides nothing: it reaches no rate.
             if (ref == 0) continue;
-            const double vco = static_cast<double>(factor) * refclk * static_cast<double>(fb) /
+            const double vco = static_cast<double>(d.factor) * refclk * static_cast<double>(fb) /
                                static_cast<double>(ref);
             if (!(vco >= vcoMin_ && vco <= vcoMax_)) continue;
-            for (const std::string& divText : lists[2]) {
+            for (const std::string& divText : d.lists[2]) {
                 const uint64_t divsel = Orv_NumberUtil::decStr2ULL(divText);
                 if (divsel == 0) continue;
                 const double rate = (vco + vco) / static_cast<double>(divsel);
-                if (maxRegister == 0 || !(rate > maximum + 1.0)) {
+                if (d.maxRegister == 0 || !(rate > maximum + 1.0)) {
                     choices.push_back(makeLineRateChoiceString(rate, fb, ref, divsel, text));
                 }
-                if (oversampled) {
-                    const double slow = rate / OVERSAMPLE_DIVISOR;
-                    if (!(slow > OVERSAMPLE_MAX)) {
-                        choices.push_back(makeLineRateChoiceString(slow, fb, ref, divsel, text));
-                    }
+                const double slow = rate / OVERSAMPLE_DIVISOR;
+                if (d.oversampled && !(slow > OVERSAMPLE_MAX)) {
+                    choices.push_back(makeLineRateChoiceString(slow, fb, ref, divsel, text));
                 }
             }
         }

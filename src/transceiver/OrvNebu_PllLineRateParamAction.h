@@ -9,7 +9,7 @@
 #include <utility>
 #include <vector>
 
-#include "slave/OrvNebu_ParamAction.h"
+#include "params/OrvNebu_ParamAction.h"
 
 namespace OrvRT {
 
@@ -54,8 +54,21 @@ protected:
 
     OrvNebu_PllLineRateParamAction(OrvNebu_DefaultSlave* slave, uint32_t priority);
 
+    // What the choices are built from, read from the slave: the divider factor, the choices of
+    // the feedback, reference and output dividers, the highest line rate register and whether
+    // the oversampling flag is set.
+    struct DividerChoices {
+        uint64_t factor = 0;
+        std::vector<std::string> lists[3];
+        uint64_t maxRegister = 0;
+        bool oversampled = false;
+    };
+
     // Fills the sub-action list from subActionNames_; throws for a name the slave lacks.
     void findSubActions();
+    DividerChoices readDividerChoices();
+    // Appends every rate the dividers reach within the PLL's range and below the maximum.
+    void addRates(double refclk, const DividerChoices& d, std::vector<std::string>& choices) const;
 
     // The divider factor from a map holding the names of factorParams_.
     virtual uint64_t dividerFactor(Orv_HashMapCStr& params) = 0;

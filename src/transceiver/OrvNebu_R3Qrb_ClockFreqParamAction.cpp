@@ -3,15 +3,6 @@
 
 namespace OrvRT {
 
-const OrvNebu_R3Qrb_ClockFreqParamAction::Param2Reg
-    OrvNebu_R3Qrb_ClockFreqParamAction::OUT_PARAM_2_REG[] = {
-        {"txuserclkout_freq", "TXUSERCLKOUT_FREQ_CNT", "TXUSERCLKOUT_FREQ_TUNE"},
-        {"rxuserclkout_freq0", "RXUSERCLKOUT_FREQ_CNT0", "RXUSERCLKOUT_FREQ_TUNE0"},
-        {"rxuserclkout_freq1", "RXUSERCLKOUT_FREQ_CNT1", "RXUSERCLKOUT_FREQ_TUNE1"},
-        {"rxuserclkout_freq2", "RXUSERCLKOUT_FREQ_CNT2", "RXUSERCLKOUT_FREQ_TUNE2"},
-        {"rxuserclkout_freq3", "RXUSERCLKOUT_FREQ_CNT3", "RXUSERCLKOUT_FREQ_TUNE3"},
-};
-
 OrvNebu_R3Qrb_ClockFreqParamAction::OrvNebu_R3Qrb_ClockFreqParamAction(OrvNebu_DefaultSlave* slave,
                                                                        uint32_t priority)
     : OrvNebu_CounterFreqParamAction(slave, priority, OUT_PARAM_2_REG, OUT_PARAM_COUNT, false) {}

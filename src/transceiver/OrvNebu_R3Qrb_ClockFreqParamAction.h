@@ -8,8 +8,9 @@ namespace OrvRT {
 class OrvNebu_R3Qrb_ClockFreqParamAction : public OrvNebu_CounterFreqParamAction {
 public:
     using Param2Reg = OrvNebu_CounterFreqParamAction::Param2Reg;
-    static const Param2Reg OUT_PARAM_2_REG[];
-    static constexpr uint32_t OUT_PARAM_COUNT = 5;
+    // The rows are the slave class table's, which the file tools read too.
+    static constexpr const Param2Reg* OUT_PARAM_2_REG = OrvNebu_SlaveClassTable::R3QRB_CLOCKS;
+    static constexpr uint32_t OUT_PARAM_COUNT = OrvNebu_SlaveClassTable::R3QRB_CLOCK_COUNT;
 
     OrvNebu_R3Qrb_ClockFreqParamAction(OrvNebu_DefaultSlave* slave, uint32_t priority);
 

@@ -9,7 +9,7 @@
 
 #include "host/OrvJtag.h"
 #include "host/OrvTypes.h"
-#include "slave/OrvNebu_ParamAction.h"
+#include "params/OrvNebu_ParamAction.h"
 #include "slave/OrvNebu_Slave.h"
 
 namespace OrvRT {

@@ -4,6 +4,7 @@
 #include <gtest/gtest.h>
 
 #include <filesystem>
+#include <fstream>
 #include <functional>
 #include <string>
 #include <vector>
@@ -14,6 +15,7 @@
 #include "slave/OrvNebu_SlaveFactory.h"
 #include "support/TempDataDir.h"
 #include "support/TestHost.h"
+#include "transceiver/OrvNebu_TransceiverClasses.h"
 
 namespace {
 
@@ -56,7 +58,7 @@ struct Fault {
     std::function<void(FaultTableTest&)> arrange;  // after board and data are in place
     std::function<uint32_t(FaultTableTest&)> act;  // the exported call that meets the fault
     uint32_t rc;
-    std::vector<Expected> messages;                    // exactly these, in order
+    std::vector<Expected> messages;                   // exactly these, in order
     std::function<void(FaultTableTest&)> afterwards;  // board, caller's data, recovery
 };
 
@@ -191,7 +193,9 @@ std::vector<Fault> faults() {
              t.ok(OrvNebu_getSlaveCount(H, 0, 1, &t.count));
              EXPECT_EQ(t.count, 0u);
          },
-         [](T& t) { return t.getRegisters(1, 0, {{"CTRL_MODE", "mine"}}); },
+         [](T& t) {
+             return t.getRegisters(1, 0, {{"CTRL_MODE", "mine"}});
+         },
          ORVNEBU_FAILED,
          {{ERR, badBus}},
          [=](T& t) {
@@ -222,8 +226,9 @@ std::vector<Fault> faults() {
          }},
         {"faulty slave",
          [](T& t) { t.board()->setSlaveFaulty(0, 1, 1, true); },
-         [](T& t) { return OrvNebu_singleSlaveRead(H, FaultTableTest::ref(1, 1), 3, t.words,
-                                                   &t.status); },
+         [](T& t) {
+             return OrvNebu_singleSlaveRead(H, FaultTableTest::ref(1, 1), 3, t.words, &t.status);
+         },
          ORVNEBU_OK,
          {},
          [](T& t) {
@@ -254,14 +259,15 @@ std::vector<Fault> faults() {
          [](T& t) { return t.initialize(1, 2); },
          ORVNEBU_FAILED,
          // The identity words read as zeros: slave type 0, which no directory line covers.
-         {{ERR, "No OrvNebu register file specified for OrvNebu slave type: 0, orv driver "
-                "version: 0"}},
+         {{ERR,
+           "No OrvNebu register file specified for OrvNebu slave type: 0, orv driver "
+           "version: 0"}},
          [](T& t) {
              EXPECT_FALSE(t.registered(1, 2));
              EXPECT_EQ(t.board()->busErrorBits(0, 1), 1u);  // the identity read found nobody
              // A transfer to the empty position reads zeros and reports the bus error.
-             EXPECT_EQ(OrvNebu_singleSlaveRead(H, FaultTableTest::ref(1, 2), 0, t.words,
-                                               &t.status), ORVNEBU_OK);
+             EXPECT_EQ(OrvNebu_singleSlaveRead(H, FaultTableTest::ref(1, 2), 0, t.words, &t.status),
+                       ORVNEBU_OK);
              EXPECT_EQ(t.words[0], 0u);
              EXPECT_EQ(t.status, 1u);
          }},
@@ -269,8 +275,9 @@ std::vector<Fault> faults() {
          nothing,
          [](T& t) { return t.initialize(1, 4); },
          ORVNEBU_FAILED,
-         {{ERR, "Device:0, user chain number:1, slave index:4, does not have a valid OrvNebu "
-                "slave index.\n"}},
+         {{ERR,
+           "Device:0, user chain number:1, slave index:4, does not have a valid OrvNebu "
+           "slave index.\n"}},
          [](T& t) { EXPECT_FALSE(t.registered(1, 4)); }},
         {"directory file missing",
          [](T& t) { std::filesystem::remove(t.data.path("orvnebu_directory.csv")); },
@@ -305,8 +312,9 @@ std::vector<Fault> faults() {
          [](T& t) { return t.initialize(1, 0); },
          ORVNEBU_FAILED,
          // The short line is passed over, so slave type 0x11 has no entry.
-         {{ERR, "No OrvNebu register file specified for OrvNebu slave type: 17, orv driver "
-                "version: 1"}},
+         {{ERR,
+           "No OrvNebu register file specified for OrvNebu slave type: 17, orv driver "
+           "version: 1"}},
          [](T& t) {
              EXPECT_FALSE(t.registered(1, 0));
              EXPECT_EQ(t.initialize(1, 1), ORVNEBU_OK);  // the lines after it still count
@@ -336,11 +344,29 @@ std::vector<Fault> faults() {
          {{LINE, "Unable to parse file: {dir}ctrl_regs.csv line:3: CTRL_MODE,0,0,1\n"},
           {ABORT, ABORT_TEXT}},
          [](T& t) { EXPECT_FALSE(t.registered(1, 0)); }},
+        {"register file spanning more than one burst",
+         [](T& t) {
+             std::ofstream(t.data.path("ctrl_regs.csv"), std::ios::app)
+                 << "FAR,1ffff,0,0,3,far away,rw,0,y\n";
+             t.ok(t.initialize(1, 0));
+         },
+         [](T& t) { return t.getRegisters(1, 0, {}); },
+         ORVNEBU_FAILED,
+         {{ERR,
+           "Registers of {dir}ctrl_regs.csv span words 0x0 to 0x1FFFF (131072 words): "
+           "more than one burst moves (131071)"}},
+         [](T& t) {
+             EXPECT_TRUE(t.caller().empty());
+             // Registers of a narrower span are read as ever.
+             EXPECT_EQ(t.getRegisters(1, 0, {{"CTRL_MODE", ""}, {"FAR", ""}}), ORVNEBU_FAILED);
+             EXPECT_EQ(t.getRegisters(1, 0, {{"CTRL_MODE", ""}}), ORVNEBU_OK);
+         }},
         {"parameter file missing",
          [](T& t) { std::filesystem::remove(t.data.path("ctrl_params.csv")); },
          [](T& t) { return t.initialize(1, 0); },
          ORVNEBU_FAILED,
-         {{ERR, "Unable to open OrvNebu parameter file: {dir}ctrl_params.csv"}, {ABORT, ABORT_TEXT}},
+         {{ERR, "Unable to open OrvNebu parameter file: {dir}ctrl_params.csv"},
+          {ABORT, ABORT_TEXT}},
          [](T& t) { EXPECT_FALSE(t.registered(1, 0)); }},
         {"parameter file unreadable (a directory)",
          [](T& t) { t.replaceByDirectory("ctrl_params.csv"); },
@@ -376,7 +402,9 @@ std::vector<Fault> faults() {
          }},
         {"parameter value that names no choice",
          [](T& t) { t.ok(t.initialize(1, 0)); },
-         [](T& t) { return t.setParameters(1, 0, {{"mode", "fast"}}); },
+         [](T& t) {
+             return t.setParameters(1, 0, {{"mode", "fast"}});
+         },
          ORVNEBU_FAILED,
          {{ERR, "Setting Parameter 'mode' to value 'fast' is not a valid choice."}},
          [](T& t) {
@@ -386,8 +414,8 @@ std::vector<Fault> faults() {
         {"line rate string that cannot be read",
          [](T& t) { t.ok(t.initialize(2, 0)); },
          [](T& t) {
-             return t.setParameters(2, 0, {{"line_rate0", "fast FB=2, REF=1, DIVSEL=1"},
-                                           {"sysclk_freq", "50"}});
+             return t.setParameters(
+                 2, 0, {{"line_rate0", "fast FB=2, REF=1, DIVSEL=1"}, {"sysclk_freq", "50"}});
          },
          ORVNEBU_FAILED,
          {{ERR, "Unable to set line rate from string 'fast FB=2, REF=1, DIVSEL=1'"}},
@@ -405,9 +433,10 @@ std::vector<Fault> faults() {
              ORV_SLAVE_REF r = FaultTableTest::ref(2, 2);
              OrvRT::Orv_Core* old = OrvRT::Orv_CoreList::getSlave(H, &r);
              OrvRT::Orv_CoreList::removeCore(H, &old);
-             OrvRT::Orv_HashMapCStr info{{"slave_type", "66"}, {"orv_drv_ver", "1"},
-                                         {"next_slave", "-1"}};
-             OrvRT::OrvNebu_Slave* looping = OrvRT::OrvNebu_SlaveFactory::create(H, r, info);
+             OrvRT::Orv_HashMapCStr info{
+                 {"slave_type", "66"}, {"orv_drv_ver", "1"}, {"next_slave", "-1"}};
+             OrvRT::OrvNebu_Slave* looping = OrvRT::OrvNebu_SlaveFactory::create(
+                 H, r, info, OrvRT::OrvNebu_TransceiverClasses::slaveClasses());
              ASSERT_NE(looping, nullptr);
              OrvRT::Orv_CoreList::addCore(H, looping);
          },
@@ -423,8 +452,8 @@ std::vector<Fault> faults() {
                        (OrvRT::Orv_HashMapCStr{{"refclk_source", "Unknown ref clock source"}}));
              t.map = t.makeMap({{"internal_param_NORTH_DRIVER", ""}});
              EXPECT_EQ(OrvNebu_getParameters(H, FaultTableTest::ref(2, 2), &t.map), ORVNEBU_OK);
-             EXPECT_EQ(t.caller(), (OrvRT::Orv_HashMapCStr{
-                                       {"internal_param_NORTH_DRIVER", "Unknown ref clock source"}}));
+             EXPECT_EQ(t.caller(), (OrvRT::Orv_HashMapCStr{{"internal_param_NORTH_DRIVER",
+                                                            "Unknown ref clock source"}}));
          }},
     };
 }
@@ -438,7 +467,8 @@ TEST_P(FaultTableTest, SurvivesWithExactReport) {
     std::vector<Message> got = messages();
     std::vector<std::pair<uint32_t, std::string>> actual, expected;
     for (const Message& m : got) actual.emplace_back(m.severity, m.text);
-    for (const Expected& e : fault.messages) expected.emplace_back(e.severity, expand(e.text, dir()));
+    for (const Expected& e : fault.messages)
+        expected.emplace_back(e.severity, expand(e.text, dir()));
     EXPECT_EQ(actual, expected);
     fault.afterwards(*this);
 }
@@ -446,8 +476,8 @@ TEST_P(FaultTableTest, SurvivesWithExactReport) {
 std::string rowName(const ::testing::TestParamInfo<Fault>& info) {
     std::string name;
     for (const char* c = info.param.name; *c != '\0'; ++c) {
-        const bool alnum = (*c >= 'a' && *c <= 'z') || (*c >= 'A' && *c <= 'Z') ||
-                           (*c >= '0' && *c <= '9');
+        const bool alnum =
+            (*c >= 'a' && *c <= 'z') || (*c >= 'A' && *c <= 'Z') || (*c >= '0' && *c <= '9');
         if (alnum) {
             name += *c;
         } else if (!name.empty() && name.back() != '_') {

@@ -70,6 +70,16 @@ TEST_F(RegisterFileTest, ExcludedLinesQuotesAndLineEnds) {
     EXPECT_NO_MESSAGES();
 }
 
+TEST_F(RegisterFileTest, OrderAndBitColumnsAreReadLikeAtoi) {
+    // Leading blanks, a sign, digits up to the first other character; no digits read 0.
+    EXPECT_EQ(image("h\n"
+                    "A,1, 2,+3,7x,,rw,,y\n"
+                    "B,2,abc,\t4, +5 ,,rw,,y\n"
+                    "C,3,+,,1st,,rw,,y\n"),
+              "h\nA,1,2,3,7,,rw,,y\nB,2,0,4,5,,rw,,y\nC,3,0,0,1,,rw,,y\n");
+    EXPECT_NO_MESSAGES();
+}
+
 TEST_F(RegisterFileTest, HeaderOnlyAndEmptyFilesHaveNoRegisters) {
     for (const char* text : {"just a header\n", ""}) {
         data_.write("empty.csv", text);
@@ -101,6 +111,10 @@ TEST_F(RegisterFileTest, ShortAndEmptyLinesAreParseErrorsWithTheirLineNumbers) {
     EXPECT_EQ(initializeWith("h\r\nA,1,0,0,0,,rw,y\r\n"), ORVNEBU_FAILED);
     EXPECT_MESSAGE(512, parseError(2, "A,1,0,0,0,,rw,y"));
 
+    // Excluded lines count: the short line after two of them is line 4.
+    EXPECT_EQ(initializeWith("h\nA,1,0,0,0,,rw,,n\nB,2,0,0,0,,rw,,no\nC,3\n"), ORVNEBU_FAILED);
+    EXPECT_MESSAGE(512, parseError(4, "C,3"));
+
     // No slave object was made: the reference has none.
     clearMessages();
     ORV_HASHMAP_HANDLE map = makeMap();
@@ -121,7 +135,8 @@ TEST_F(RegisterFileTest, BitsAndAddressesOutsideTheWordAreRefused) {
         EXPECT_EQ(initializeWith("h\nOK,1,0,0,31,,rw,,y\n" + lines[i] + "\n"), ORVNEBU_FAILED);
         auto m = messages();
         ASSERT_EQ(m.size(), 3u) << lines[i];
-        EXPECT_EQ(m[0].severity, 512u);
+        // The reason comes at the severity of every other reason, the line at 512.
+        EXPECT_EQ(m[0].severity, 256u);
         EXPECT_EQ(m[0].text, reasons[i]);
         EXPECT_EQ(m[1].severity, 512u);
         EXPECT_EQ(m[1].text, parseError(3, lines[i]));
@@ -156,6 +171,20 @@ TEST_F(RegisterFileTest, MissingFileIsReportedAndTheReferenceGivenBack) {
     EXPECT_THROW(
         OrvNebu_DefaultRegisterHandler::readAndPrint(HANDLE, data_.path("missing.csv"), out),
         std::logic_error);
+}
+
+TEST_F(RegisterFileTest, AccessLettersRefuseNoReadOrWrite) {
+    ASSERT_EQ(initializeWith("h\nRO,1,0,0,15,,r,,y\nWO,2,0,0,15,,w,,y\nNONE,3,0,0,15,,,,y\n"),
+              ORVNEBU_OK);
+    ORV_HASHMAP_HANDLE set = makeMap({{"RO", "1111"}, {"WO", "2222"}, {"NONE", "3333"}});
+    ASSERT_EQ(setRegs(0, set), ORVNEBU_OK);
+    EXPECT_EQ(peek(0, 1), 0x1111);
+    EXPECT_EQ(peek(0, 3), 0x3333);
+    ORV_HASHMAP_HANDLE get = makeMap({{"RO", ""}, {"WO", ""}, {"NONE", ""}});
+    ASSERT_EQ(getRegs(0, get), ORVNEBU_OK);
+    EXPECT_EQ(mapOf(get)["WO"], "2222");
+    EXPECT_EQ(mapOf(get)["NONE"], "3333");
+    EXPECT_NO_MESSAGES();
 }
 
 TEST_F(RegisterFileTest, RegisterWithoutNameIsPrintedButCannotBeNamed) {

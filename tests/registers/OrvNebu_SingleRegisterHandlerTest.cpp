@@ -103,6 +103,36 @@ TEST_F(SingleRegisterHandlerTest, EmptyWriteAndBadInputSendNothing) {
     EXPECT_EQ(peek(0, 2), 0x7777);
 }
 
+TEST_F(SingleRegisterHandlerTest, ReadsNothingBeforeEveryKeyPassedThenHighestOrderFirst) {
+    ORV_HASHMAP_HANDLE bad = makeMap({{"A", ""}, {"WIDE", ""}, {"Nope", ""}});
+    EXPECT_EQ(getRegs(0, bad), ORVNEBU_FAILED);
+    EXPECT_MESSAGE(256, "Invalid Register Name: Nope\n");
+    EXPECT_TRUE(trace().empty());
+
+    poke(0, 0x10, 0xCDEF);
+    poke(0, 0x11, 0x00AB);
+    ORV_HASHMAP_HANDLE wide = makeMap({{"WIDE", ""}});
+    ASSERT_EQ(getRegs(0, wide), ORVNEBU_OK);
+    EXPECT_EQ(mapOf(wide)["WIDE"], "ABCDEF");
+    const auto t = transfers();
+    ASSERT_EQ(t.size(), 2u);
+    EXPECT_EQ(t[0].address, 0x11u);  // order 1
+    EXPECT_EQ(t[1].address, 0x10u);  // order 0
+}
+
+TEST_F(SingleRegisterHandlerTest, AnyNonEmptyValueOfTheVariableSelectsIt) {
+    // The value is not looked at: "0" selects the single-register handler too.
+    setenv("ZAN_ORV_SWITCH_REG_HANDLER", "0", 1);
+    ASSERT_EQ(initialize(1), ORVNEBU_OK);
+    EXPECT_EQ(OrvNebu_SingleRegisterHandler::getHandlerCount(), 2u);
+    EXPECT_EQ(OrvNebu_DefaultRegisterHandler::getHandlerCount(), 0u);
+    clearTrace();
+    ORV_HASHMAP_HANDLE map = makeMap({{"A", ""}, {"B", ""}});
+    ASSERT_EQ(getRegs(1, map), ORVNEBU_OK);
+    ASSERT_EQ(transfers().size(), 2u);
+    EXPECT_FALSE(transfers()[0].burst);
+}
+
 TEST_F(SingleRegisterHandlerTest, EachHandlerClassKeepsItsOwnCache) {
     const std::string file = data_.path("regs.csv");
     EXPECT_NE(OrvNebu_SingleRegisterHandler::findRegisterHandler(HANDLE, file), nullptr);

@@ -7,6 +7,7 @@
 #include "slave/OrvNebu_DirectoryReader.h"
 #include "slave/OrvNebu_SlaveFactory.h"
 #include "support/RegsFixture.h"
+#include "transceiver/OrvNebu_TransceiverClasses.h"
 #include "transceiver/OrvNebu_VanduM3Qrc.h"
 #include "transceiver/OrvNebu_VanduR2Qra.h"
 #include "transceiver/OrvNebu_VanduR3Qra.h"
@@ -133,6 +134,7 @@ TEST_F(DirectoryReaderTest, MissingFileAndMissingEntry) {
     EXPECT_EQ(m[0].severity, 256u);
     EXPECT_EQ(m[0].text, "Unable to open " + data_.path("nowhere") + "/orvnebu_directory.csv");
     EXPECT_EQ(m[1].severity, 32768u);
+
     setDataDir(data_.dir());
 
     EXPECT_EQ(initializeWith("slave_type,orv_drv_ver_min,orv_drv_ver_max,registers,parameters\n"
@@ -175,6 +177,12 @@ protected:
 };
 
 TEST_F(SlaveFactoryRecords, FourteenRecordsSortedWithTheirVersionRangesAndClasses) {
+    using Table = OrvRT::OrvNebu_SlaveClassTable;
+    const OrvNebu_SlaveFactory::SlaveClasses& classes =
+        OrvRT::OrvNebu_TransceiverClasses::slaveClasses();
+    auto find = [&classes](int32_t type, int32_t version) {
+        return OrvNebu_SlaveFactory::findCreateFunction(type, version, classes);
+    };
     const std::string plain = typeid(OrvRT::OrvNebu_DefaultSlave).name();
     const std::string m3qrc = typeid(OrvRT::OrvNebu_VanduM3Qrc).name();
     const std::string r2qra = typeid(OrvRT::OrvNebu_VanduR2Qra).name();
@@ -191,19 +199,21 @@ TEST_F(SlaveFactoryRecords, FourteenRecordsSortedWithTheirVersionRangesAndClasse
                       {0x31, 1, 0xFFFF, plain, "ctrl"},        {0x41, 1, 1, plain, "ctrl"},
                       {0x42, 1, 1, r2qra, "vandu_r2qra"},      {0x43, 1, 1, r3qra, "vandu_r3qra"},
                       {0x44, 1, 1, m3qrc, "vandu_m3qrc"},      {0x45, 1, 1, r3qrb, "vandu_r3qrb"}};
-    size_t count = 0;
-    const OrvNebu_SlaveFactory::CreationRecord* r = OrvNebu_SlaveFactory::records(count);
-    ASSERT_EQ(count, 14u);
-    for (size_t i = 0; i < count; ++i) {
+    // The factory's table, with the creation functions the layer above enters.
+    const std::vector<Table::Record>& r = Table::records();
+    ASSERT_EQ(r.size(), 14u);
+    for (size_t i = 0; i < r.size(); ++i) {
         EXPECT_EQ(r[i].slaveType, expected[i].type) << i;
         EXPECT_EQ(r[i].minDriverVersion, expected[i].min) << i;
         EXPECT_EQ(r[i].maxDriverVersion, expected[i].max) << i;
-        EXPECT_EQ(built(r[i].create, expected[i].files), expected[i].cls) << i;
+        const OrvNebu_SlaveFactory::CreateFunction create = classes.create[r[i].slaveClass];
+        EXPECT_EQ(built(create, expected[i].files), expected[i].cls) << i;
+        // The table names the class that is built (the file tools read the name).
+        EXPECT_NE(expected[i].cls.find(Table::info(r[i].slaveClass).className), std::string::npos)
+            << i;
         // Every record is found for its own range, and only for it.
-        EXPECT_EQ(OrvNebu_SlaveFactory::findCreateFunction(r[i].slaveType, r[i].minDriverVersion),
-                  r[i].create);
-        EXPECT_EQ(OrvNebu_SlaveFactory::findCreateFunction(r[i].slaveType, r[i].maxDriverVersion),
-                  r[i].create);
+        EXPECT_EQ(find(r[i].slaveType, r[i].minDriverVersion), create);
+        EXPECT_EQ(find(r[i].slaveType, r[i].maxDriverVersion), create);
     }
     // Outside every record the default slave is built, whatever files come with it.
     const struct {
@@ -215,11 +225,9 @@ TEST_F(SlaveFactoryRecords, FourteenRecordsSortedWithTheirVersionRangesAndClasse
                      {0x41, 2, "ctrl"},
                      {0x99, 1, "ctrl"}};
     for (const auto& u : uncovered) {
-        EXPECT_EQ(built(OrvNebu_SlaveFactory::findCreateFunction(u.type, u.version), u.files),
-                  plain)
-            << u.type << " " << u.version;
+        EXPECT_EQ(built(find(u.type, u.version), u.files), plain) << u.type << " " << u.version;
     }
-    EXPECT_EQ(built(OrvNebu_SlaveFactory::findCreateFunction(0x15, 7), "vandu_r3qra"), r3qra);
+    EXPECT_EQ(built(find(0x15, 7), "vandu_r3qra"), r3qra);
     EXPECT_TRUE(noMessages());
 }
 

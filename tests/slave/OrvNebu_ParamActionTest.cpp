@@ -5,8 +5,8 @@
 #include <utility>
 #include <vector>
 
+#include "params/OrvNebu_ParamAction.h"
 #include "params/OrvNebu_ParamChoiceAction.h"
-#include "slave/OrvNebu_ParamAction.h"
 
 using OrvRT::OrvNebu_ActionsMap;
 using OrvRT::OrvNebu_ParamAction;

@@ -2,11 +2,14 @@
 // missing choice parameter does to the registration, and the creation that reports failures.
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <memory>
+#include <set>
 #include <stdexcept>
 #include <string>
 #include <vector>
 
+#include "base/OrvNebu_SlaveClassTable.h"
 #include "support/TestHost.h"
 #include "transceiver/OrvNebu_VanduM3Qrc.h"
 #include "transceiver/OrvNebu_VanduR2Qra.h"
@@ -31,6 +34,9 @@ public:
         }
     }
     void registerActions() { this->addToActionsHashMap(1, this->actions_); }
+    void addAction(OrvNebu_ParamAction* action) {
+        OrvNebu_ParamAction::addActionToHashMap(this->actions_, action);
+    }
     // The priority of the action under name, or 0 when there is none.
     uint32_t priorityOf(const std::string& name) {
         OrvNebu_ParamAction* action = this->getParamAction(name);
@@ -92,6 +98,56 @@ TEST(VanduSlaves, ComputedActionsAndTheirPriorities) {
     EXPECT_EQ(5001u, r2.priorityOf("refclk_freq"));
     EXPECT_EQ(5002u, r2.priorityOf("internal_param_NORTH_DRIVER"));
     EXPECT_FALSE(r2.getParamAction("refclk_source")->isChoiceParam());
+}
+
+namespace {
+
+// Registers class V's actions with the choice parameters the table names, and checks each
+// computed action of the table against the one registered: its priority, the names it
+// answers, and the registers it reads (which the table lists, among those it also writes).
+template <class V>
+void expectAsTheTableSays(OrvRT::OrvNebu_SlaveClassTable::SlaveClass slaveClass) {
+    const auto& info = OrvRT::OrvNebu_SlaveClassTable::info(slaveClass);
+    SCOPED_TRACE(info.className);
+    std::set<std::string> choices;
+    for (const auto& action : info.actions) {
+        choices.insert(action.choiceParameters.begin(), action.choiceParameters.end());
+    }
+    std::vector<std::unique_ptr<xcvrtest::ChoiceAction>> owned;
+    Registered<V> slave({});
+    for (const std::string& name : choices) {
+        owned.push_back(std::make_unique<xcvrtest::ChoiceAction>(name, name, 10002));
+        slave.addAction(owned.back().get());
+    }
+    slave.registerActions();
+    EXPECT_EQ(choices.size() + info.actions.size(), slave.distinctActions());
+    for (size_t i = 0; i < info.actions.size(); ++i) {
+        const auto& described = info.actions[i];
+        OrvNebu_ParamAction* action = slave.getParamAction(described.parameters.front());
+        ASSERT_NE(action, nullptr) << described.className;
+        EXPECT_EQ(OrvRT::OrvNebu_SlaveClassTable::START_PRIORITY + i, action->getPriority());
+        EXPECT_EQ(std::set<std::string>(described.parameters.begin(), described.parameters.end()),
+                  std::set<std::string>(action->getParamNames()->begin(),
+                                        action->getParamNames()->end()));
+        Orv_HashMapCStr read;
+        action->getRegsToRead(read);
+        for (const auto& entry : read) {
+            const bool listed = std::count(described.registers.begin(), described.registers.end(),
+                                           entry.first) != 0;
+            EXPECT_TRUE(listed || choices.count(entry.first) != 0)
+                << described.className << " reads " << entry.first;
+        }
+    }
+}
+
+}  // namespace
+
+TEST(VanduSlaves, TheSlaveClassTableDescribesEachClassAsItRegisters) {
+    using Table = OrvRT::OrvNebu_SlaveClassTable;
+    expectAsTheTableSays<OrvNebu_VanduM3Qrc>(Table::VANDU_M3QRC);
+    expectAsTheTableSays<OrvNebu_VanduR2Qra>(Table::VANDU_R2QRA);
+    expectAsTheTableSays<OrvNebu_VanduR3Qra>(Table::VANDU_R3QRA);
+    expectAsTheTableSays<OrvNebu_VanduR3Qrb>(Table::VANDU_R3QRB);
 }
 
 TEST(VanduSlaves, MissingChoiceParameterStopsTheRegistrationAfterEarlierActions) {

@@ -1,40 +1,29 @@
-// What `nebu doc` draws: a data directory as plain records, filled by DocReader from the
-// library's definition-file readers and turned into pages by DocSite. Nothing here reads files.
+// What `nebu doc` draws: a data directory as the library's definition-file reader gives it
+// (OrvNebu_DataDirectory), with what the pages need on top: the register bits of each slice, the
+// bits each choice writes, the classes over a row's versions. Filled by DocReader, turned into
+// pages by DocSite. Nothing here reads files.
 #pragma once
 
 #include <cstdint>
 #include <string>
 #include <vector>
 
+#include "base/OrvNebu_DirectoryFile.h"
+#include "base/OrvNebu_FileProblem.h"
+#include "base/OrvNebu_ParamFile.h"
+#include "base/OrvNebu_RegisterFile.h"
+#include "base/OrvNebu_SlaveClassTable.h"
+
 namespace nebu {
 namespace doc {
 
-struct Problem {
-    std::string file;   // as lint names it: data directory + the name the directory file gives
-    uint32_t line = 0;  // 0: the file as a whole
-    std::string text;
-};
+typedef OrvRT::OrvNebu_FileProblem Problem;
 
-// One line of a register file after the header.
-struct Slice {
-    uint32_t line = 0;
-    std::string registerName;
-    bool included = true;
-    // Included lines: as the plug-in holds them.
-    uint32_t address = 0;
-    uint32_t order = 0;
-    uint32_t startBit = 0;     // word bit of the slice's least significant bit
-    uint32_t endBit = 0;       // word bit of the slice's most significant bit
-    uint32_t registerLow = 0;  // register bit carried by startBit
-    std::string access;        // "r", "w", "rw" or ""
-    std::string description;
-    // Excluded lines: the columns as they stand.
-    std::vector<std::string> columns;
+// One line of a register file after the header that the reader could parse, as it holds it.
+struct Slice : OrvRT::OrvNebu_RegisterFile::RegisterSlice {
+    uint32_t registerLow = 0;  // register bit carried by startBit (included lines)
 
-    uint32_t low() const { return startBit < endBit ? startBit : endBit; }
-    uint32_t high() const { return startBit < endBit ? endBit : startBit; }
-    uint32_t width() const { return high() - low() + 1; }
-    bool reversed() const { return startBit > endBit; }
+    std::string access() const { return std::string(readable ? "r" : "") + (writable ? "w" : ""); }
 };
 
 struct Register {
@@ -44,12 +33,11 @@ struct Register {
 };
 
 struct RegisterFile {
-    std::string name;  // as the directory file gives it
-    std::string path;  // as problems name it
-    std::string page;  // file name of its page
-    bool opened = false;
+    std::string name;                 // as the directory file gives it
+    std::string path;                 // as problems name it
+    std::string page;                 // file name of its page
     bool refused = false;             // a line the plug-in refuses, so it refuses the whole file
-    std::vector<Slice> slices;        // lines the plug-in can read, in file order
+    std::vector<Slice> slices;        // lines the reader could parse, in file order
     std::vector<Register> registers;  // in order of first line
 };
 
@@ -60,9 +48,9 @@ struct BitWrite {
     bool one = false;
 };
 
-struct Setting {
-    std::string registerName;
-    std::string digits;  // the register's value, most significant first, as written
+// A register value a choice writes, and the bits the plug-in writes for it.
+struct Setting : OrvRT::OrvNebu_ParamFile::Setting {
+    std::string digits;  // the register's value, most significant first, as the plug-in takes it
     std::vector<BitWrite> bits;
     std::string problem;  // why it cannot be shown on the register's bits
 };
@@ -75,31 +63,25 @@ struct Choice {
 
 struct Parameter {
     std::string name;
+    uint32_t line = 0;
     std::vector<Choice> choices;  // in index order
 };
 
-// A parameter a slave class computes instead of taking it from the parameter file.
-struct ComputedParameter {
-    std::vector<std::string> names;             // the names it answers to
-    std::vector<std::string> registers;         // what it reads (or writes)
-    std::vector<std::string> choiceParameters;  // of the parameter file, that it works through
-};
-
-// The slave class the factory makes for some directory rows naming the parameter file.
+// A transceiver class the factory makes for some directory rows naming the parameter file,
+// and the parameters it computes instead of taking them from the file.
 struct ClassUse {
     std::string className;
     std::vector<int32_t> slaveTypes;
-    std::vector<ComputedParameter> computed;
-    std::string problem;  // why its computed parameters could not be listed
+    const std::vector<OrvRT::OrvNebu_SlaveClassTable::ComputedAction>* computed = nullptr;
 };
 
 struct ParameterFile {
     std::string name;
     std::string path;
     std::string page;
-    bool read = false;                  // the plug-in reads it
+    bool refused = false;               // a row the plug-in refuses, so it refuses the whole file
     int registerFile = -1;              // index of the register file its settings are drawn on
-    std::vector<Parameter> parameters;  // in file order
+    std::vector<Parameter> parameters;  // those the reader could read, in file order
     std::vector<ClassUse> classes;      // transceiver classes only
 };
 
@@ -108,16 +90,12 @@ struct ClassSpan {
     int32_t minVersion = 0;
     int32_t maxVersion = 0;
     std::string className;
+    bool transceiver = false;
+    const std::vector<OrvRT::OrvNebu_SlaveClassTable::ComputedAction>* computed = nullptr;
 };
 
-struct DirectoryRow {
-    uint32_t line = 0;
-    int32_t slaveType = 0;
-    int32_t minVersion = 0;
-    int32_t maxVersion = 0;
+struct DirectoryRow : OrvRT::OrvNebu_DirectoryFile::Row {
     std::vector<ClassSpan> classes;
-    std::string registerFile;  // as the row gives them
-    std::string parameterFile;
     int registerIndex = -1;  // into Site::registerFiles, -1 when not opened or not given
     int parameterIndex = -1;
 };

@@ -1,5 +1,5 @@
-// Fills the model of `nebu doc` from what lint finds and from the library's own readers, so the
-// pages show what the plug-in makes of the files.
+// Fills the model of `nebu doc` from the library's definition-file reader, so that the pages
+// show what the plug-in makes of the files and the problems lint reports.
 #pragma once
 
 #include <string>
@@ -10,7 +10,7 @@ namespace nebu {
 namespace doc {
 
 // dataDir ends in a separator. Never throws for bad files: what cannot be read is left out
-// and lint's problems say why.
+// and the reader's problems say why.
 Site readSite(const std::string& dataDir);
 
 }  // namespace doc

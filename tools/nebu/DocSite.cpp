@@ -18,6 +18,8 @@ const char* const MARKER = "written by nebu doc";
 
 namespace {
 
+typedef OrvRT::OrvNebu_SlaveClassTable::ComputedAction ComputedAction;
+
 const char* const STYLE = R"css(
 :root {
   --ink: #16202b; --muted: #56606b; --line: #c3c9cf; --soft: #f3f5f7; --accent: #1d4e89;
@@ -142,7 +144,10 @@ std::string problemsSection(const Site& site, const std::string& path) {
     for (const Problem& p : site.problems) {
         if (p.file != path) continue;
         ++count;
-        items += "<li><code>" + esc(where(p)) + "</code>: " + esc(p.text) + "</li>\n";
+        items +=
+            "<li><code>" + esc(where(p)) + "</code>: " + esc(p.text) +
+            (p.refusesFile() ? " <span class=\"flag\">(the plug-in refuses the file)</span>" : "") +
+            "</li>\n";
     }
     if (count == 0) return "<p class=\"clean\">Lint finds no problem in this file.</p>\n";
     return "<section class=\"problems\" aria-labelledby=\"problems\">\n<h2 id=\"problems\">" +
@@ -229,9 +234,10 @@ std::string indexPage(const Site& site) {
         html += "<tr" + std::string(faults.empty() ? "" : " class=\"fault\"") + " data-line=\"" +
                 std::to_string(row.line) + "\"><td class=\"num\">" + std::to_string(row.line) +
                 "</td><td class=\"num\">" + typeText(row.slaveType) + "</td><td class=\"num\">" +
-                versionText(row.minVersion) + " to " + versionText(row.maxVersion) + "</td><td>" +
-                classText(row) + "</td><td>" + file(row.registerIndex, row.registerFile, true) +
-                "</td><td>" + file(row.parameterIndex, row.parameterFile, false) + "</td><td>" +
+                versionText(row.minDriverVersion) + " to " + versionText(row.maxDriverVersion) +
+                "</td><td>" + classText(row) + "</td><td>" +
+                file(row.registerIndex, row.registers, true) + "</td><td>" +
+                file(row.parameterIndex, row.parameters, false) + "</td><td>" +
                 (count == 0 ? std::string("ok")
                             : "<span class=\"flag\">" + std::to_string(count) +
                                   (count == 1 ? " problem" : " problems") + "</span>") +
@@ -266,13 +272,13 @@ std::string registerTable(const RegisterFile& file) {
     for (const Slice& s : file.slices) {
         const std::string line = "<td class=\"num\">" + std::to_string(s.line) + "</td>";
         if (!s.included) {
-            const auto col = [&](size_t i) {
-                return "<code>" + (i < s.columns.size() ? esc(s.columns[i]) : "") + "</code>";
-            };
+            // As the line gives them: the plug-in looks no further.
             html += "<tr class=\"excluded\" data-row=\"" + std::to_string(s.line) +
-                    "\" data-register=\"" + esc(s.registerName) + "\">" + line + "<td>" + col(0) +
-                    "</td><td>" + col(1) + "</td><td>" + col(3) + " to " + col(4) +
-                    "</td><td>-</td><td>-</td><td>" + col(6) + "</td><td>" + col(2) +
+                    "\" data-register=\"" + esc(s.registerName) + "\">" + line + "<td><code>" +
+                    esc(s.registerName) + "</code></td><td class=\"num\">" + wordText(s.address) +
+                    "</td><td class=\"num\">" + std::to_string(s.startBit) + " to " +
+                    std::to_string(s.endBit) + "</td><td>-</td><td>-</td><td><code>" +
+                    esc(s.access()) + "</code></td><td class=\"num\">" + std::to_string(s.order) +
                     "</td><td>no: the plug-in skips the line</td></tr>\n";
             continue;
         }
@@ -287,12 +293,12 @@ std::string registerTable(const RegisterFile& file) {
             esc(s.registerName) + "\">" + line + "<td><code>" +
             (s.registerName.empty() ? "(no name)" : esc(s.registerName)) +
             "</code></td><td class=\"num\"><a href=\"#" + wordId(s.address) + "\">" +
-            wordText(s.address) + "</a></td><td class=\"num\">" + bitSpan(s.high(), s.low()) +
-            (s.reversed() ? " reversed" : "") + "</td><td class=\"num\">" +
-            (s.reversed() ? bitSpan(s.registerLow, regHigh) : bitSpan(regHigh, s.registerLow)) +
+            wordText(s.address) + "</a></td><td class=\"num\">" + bitSpan(s.highBit(), s.lowBit()) +
+            (s.bitReversed() ? " reversed" : "") + "</td><td class=\"num\">" +
+            (s.bitReversed() ? bitSpan(s.registerLow, regHigh) : bitSpan(regHigh, s.registerLow)) +
             "</td><td class=\"num\">" + std::to_string(s.width()) +
             (reg != nullptr && reg->width != s.width() ? " of " + std::to_string(reg->width) : "") +
-            "</td><td><code>" + esc(s.access) + "</code></td><td class=\"num\">" +
+            "</td><td><code>" + esc(s.access()) + "</code></td><td class=\"num\">" +
             std::to_string(s.order) + "</td><td>yes</td></tr>\n";
     }
     return html + "</tbody>\n</table>\n";
@@ -329,9 +335,6 @@ std::string registerPage(const Site& site, size_t index) {
                                      (params.empty() ? "" : "; parameters in " + params) + ". " +
                                      std::to_string(file.registers.size()) + " registers.");
     html += pictureDefs() + problemsSection(site, file.path);
-    if (!file.opened) {
-        return html + "<p class=\"notice\">The file cannot be read.</p>\n" + pageEnd(site);
-    }
     if (file.refused) {
         html +=
             "<p class=\"notice\">The plug-in refuses this file because of a line listed "
@@ -378,11 +381,10 @@ std::string bitsWritten(const Setting& setting) {
 
 std::string parameterSection(const RegisterFile* registers, const Parameter& parameter) {
     const std::string pid = "param-" + idPart(parameter.name);
-    const uint32_t firstLine = parameter.choices.empty() ? 0 : parameter.choices.front().line;
     std::string html = "<section class=\"param\" id=\"" + pid + "\">\n<h3><code>" +
                        esc(parameter.name) + "</code> <span class=\"meta\">line " +
-                       std::to_string(firstLine) + ", " + std::to_string(parameter.choices.size()) +
-                       " choices</span></h3>\n";
+                       std::to_string(parameter.line) + ", " +
+                       std::to_string(parameter.choices.size()) + " choices</span></h3>\n";
     html += "<table class=\"choices\" id=\"tbl-" + pid + "\">\n<caption>Choices of <code>" +
             esc(parameter.name) +
             "</code> in order, and what each writes</caption>\n<thead><tr><th "
@@ -452,25 +454,21 @@ std::string computedSection(const Site& site, const ParameterFile& file) {
         for (int32_t t : use.slaveTypes) types += (types.empty() ? "" : ", ") + typeText(t);
         html += "<h3>" + esc(use.className) + " <span class=\"meta\">slave types " + types +
                 "</span></h3>\n";
-        if (!use.problem.empty()) {
-            html += "<p class=\"notice\">" + esc(use.problem) + "</p>\n";
-            continue;
-        }
         bool throughChoices = false;
-        for (const ComputedParameter& c : use.computed) {
+        for (const ComputedAction& c : *use.computed) {
             throughChoices = throughChoices || !c.choiceParameters.empty();
         }
         html +=
             "<table class=\"computed\">\n<caption>Parameters the class adds to those of the "
-            "file, and the registers each reads</caption>\n<thead><tr><th "
+            "file, and the registers each reads or writes</caption>\n<thead><tr><th "
             "scope=\"col\">Parameters</th><th scope=\"col\">Registers</th>" +
             std::string(throughChoices ? "<th scope=\"col\">Through choice parameters</th>" : "") +
             "</tr></thead>\n<tbody>\n";
         const std::string regLinks = registers != nullptr ? registers->page + "#reg-" : "";
-        for (const ComputedParameter& c : use.computed) {
+        for (const ComputedAction& c : *use.computed) {
             const std::string regs = codeList(c.registers, regLinks);
             html +=
-                "<tr><td>" + codeList(c.names, "") + "</td><td>" +
+                "<tr><td>" + codeList(c.parameters, "") + "</td><td>" +
                 (regs.empty() ? "none: a value the host passes in" : regs) + "</td>" +
                 (throughChoices ? "<td>" + codeList(c.choiceParameters, "#param-") + "</td>" : "") +
                 "</tr>\n";
@@ -494,19 +492,18 @@ std::string parameterPage(const Site& site, size_t index) {
                                             : "") +
                       ". " + std::to_string(file.parameters.size()) + " parameters.");
     html += pictureDefs() + problemsSection(site, file.path);
-    if (!file.read) {
+    if (file.refused) {
         html +=
             "<p class=\"notice\">The plug-in refuses this file because of a problem listed "
-            "above, and a slave that names it is not created.</p>\n";
-    } else {
-        html += "<h2>Parameters</h2>\n<p>";
-        for (const Parameter& p : file.parameters) {
-            html +=
-                "<a href=\"#param-" + idPart(p.name) + "\"><code>" + esc(p.name) + "</code></a> ";
-        }
-        html += "</p>\n";
-        for (const Parameter& p : file.parameters) html += parameterSection(registers, p);
+            "above, and a slave that names it is not created; the parameters that can be read "
+            "are shown.</p>\n";
     }
+    html += "<h2>Parameters</h2>\n<p>";
+    for (const Parameter& p : file.parameters) {
+        html += "<a href=\"#param-" + idPart(p.name) + "\"><code>" + esc(p.name) + "</code></a> ";
+    }
+    html += "</p>\n";
+    for (const Parameter& p : file.parameters) html += parameterSection(registers, p);
     return html + computedSection(site, file) + pageEnd(site);
 }
 

@@ -143,7 +143,8 @@ void drawLabel(std::string& svg, const Fit& fit, int cx, int cy, bool halo) {
 
 // Register bit carried by a word bit of the slice.
 uint32_t registerBit(const Slice& s, uint32_t bit) {
-    return s.reversed() ? s.registerLow + (s.startBit - bit) : s.registerLow + (bit - s.startBit);
+    return s.bitReversed() ? s.registerLow + (s.startBit - bit)
+                           : s.registerLow + (bit - s.startBit);
 }
 
 const Register* registerOf(const RegisterFile& file, const std::string& name) {
@@ -171,12 +172,12 @@ public:
         for (size_t i = 0; i < file.slices.size(); ++i) {
             const Slice& s = file.slices[i];
             if (!s.included || s.address != address) continue;
-            for (uint32_t b = s.low(); b <= s.high(); ++b) claims_[b].push_back(i);
-            if (s.low() < BUS_BITS) {
-                pieces_.push_back(Piece{i, std::min(s.high(), BUS_BITS - 1), s.low(), 0, 0});
+            for (uint32_t b = s.lowBit(); b <= s.highBit(); ++b) claims_[b].push_back(i);
+            if (s.lowBit() < BUS_BITS) {
+                pieces_.push_back(Piece{i, std::min(s.highBit(), BUS_BITS - 1), s.lowBit(), 0, 0});
             }
-            if (s.high() >= BUS_BITS && !lowBandOnly) {
-                pieces_.push_back(Piece{i, s.high(), std::max(s.low(), BUS_BITS), 1, 0});
+            if (s.highBit() >= BUS_BITS && !lowBandOnly) {
+                pieces_.push_back(Piece{i, s.highBit(), std::max(s.lowBit(), BUS_BITS), 1, 0});
                 upperShown_ = true;
             }
         }
@@ -240,7 +241,7 @@ public:
         std::vector<std::pair<uint32_t, std::string>> rows;
         for (size_t i = 0; i < file_.slices.size(); ++i) {
             const Slice& s = file_.slices[i];
-            if (s.included && s.address == address_) rows.emplace_back(s.high(), sliceRow(i));
+            if (s.included && s.address == address_) rows.emplace_back(s.highBit(), sliceRow(i));
         }
         uint32_t bit = BUS_BITS;
         while (bit-- > 0) {
@@ -276,11 +277,12 @@ private:
     std::string sliceRow(size_t i) const {
         const Slice& s = file_.slices[i];
         std::vector<std::string> notes;
-        if (s.reversed()) {
+        if (s.bitReversed()) {
             notes.push_back("bit-reversed: register bit " + std::to_string(s.registerLow) +
                             " at word bit " + std::to_string(s.startBit));
         }
-        if (s.high() >= BUS_BITS) notes.push_back("bits 16 to 31 are not carried by slave words");
+        if (s.highBit() >= BUS_BITS)
+            notes.push_back("bits 16 to 31 are not carried by slave words");
         const Register* reg = registerOf(file_, s.registerName);
         if (reg != nullptr && reg->slices.size() > 1) {
             const size_t k = partIndex(*reg, i);
@@ -296,10 +298,11 @@ private:
         std::string joined;
         for (const std::string& n : notes) joined += (joined.empty() ? "" : "; ") + n;
         return "<tr data-register=\"" + esc(s.registerName) + "\"><td class=\"num\">" +
-               bitSpan(s.high(), s.low()) + "</td><td><a href=\"#" + registerId(s.registerName) +
-               "\"><code>" + esc(s.registerName) + "</code></a></td><td class=\"num\">" +
-               bitSpan(registerBit(s, s.high()), registerBit(s, s.low())) + "</td><td><code>" +
-               esc(s.access) + "</code></td><td>" + joined + "</td></tr>";
+               bitSpan(s.highBit(), s.lowBit()) + "</td><td><a href=\"#" +
+               registerId(s.registerName) + "\"><code>" + esc(s.registerName) +
+               "</code></a></td><td class=\"num\">" +
+               bitSpan(registerBit(s, s.highBit()), registerBit(s, s.lowBit())) +
+               "</td><td><code>" + esc(s.access()) + "</code></td><td>" + joined + "</td></tr>";
     }
 
     void assignLanes() {
@@ -350,7 +353,7 @@ private:
         }
         extras.push_back({range});
         const int w = static_cast<int>(p.high - p.low + 1) * COL - 6;
-        const int h = laneHeight - 6 - (s.reversed() ? ARROW_SPACE : 0);
+        const int h = laneHeight - 6 - (s.bitReversed() ? ARROW_SPACE : 0);
         return fitLabel(s.registerName, extras, w, h, laneHeight == TALL_LANE, fit);
     }
 
@@ -376,18 +379,18 @@ private:
         const int top = y + 2;
         const int h = laneHeight - 4;
         const bool idle = !touched_.empty() && touched_.count(s.registerName) == 0;
-        const char* kind = idle           ? "box idle"
-                           : p.band == 1  ? "box beyond"
-                           : s.reversed() ? "box rev"
-                                          : "box";
+        const char* kind = idle              ? "box idle"
+                           : p.band == 1     ? "box beyond"
+                           : s.bitReversed() ? "box rev"
+                                             : "box";
         svg += "<a href=\"" + esc(link(s)) + "\"><g class=\"slice\" data-line=\"" +
                std::to_string(s.line) + "\" data-register=\"" + esc(s.registerName) +
                "\" data-word=\"" + wordText(s.address) + "\" data-bits=\"" +
-               bitSpan(s.high(), s.low()) + "\" data-register-bits=\"" +
-               bitSpan(registerBit(s, s.high()), registerBit(s, s.low())) + "\">";
+               bitSpan(s.highBit(), s.lowBit()) + "\" data-register-bits=\"" +
+               bitSpan(registerBit(s, s.highBit()), registerBit(s, s.lowBit())) + "\">";
         svg += "<title>" + esc(s.registerName) + ": register bits " +
                bitSpan(registerBit(s, p.high), registerBit(s, p.low)) + " in word bits " +
-               bitSpan(p.high, p.low) + (s.reversed() ? ", bit-reversed" : "") + " (line " +
+               bitSpan(p.high, p.low) + (s.bitReversed() ? ", bit-reversed" : "") + " (line " +
                std::to_string(s.line) + ")</title>";
         svg += "<rect class=\"" + std::string(kind) + "\" x=\"" + num(x) + "\" y=\"" + num(top) +
                "\" width=\"" + num(w) + "\" height=\"" + num(h) + "\" rx=\"3\"/>";
@@ -398,9 +401,9 @@ private:
         }
         Fit fit;
         label(p, laneHeight, fit);
-        const int arrow = s.reversed() ? ARROW_SPACE : 0;
-        drawLabel(svg, fit, x + w / 2, top + (h - arrow) / 2, p.band == 1 || s.reversed());
-        if (s.reversed()) {
+        const int arrow = s.bitReversed() ? ARROW_SPACE : 0;
+        drawLabel(svg, fit, x + w / 2, top + (h - arrow) / 2, p.band == 1 || s.bitReversed());
+        if (s.bitReversed()) {
             // Toward the register's most significant bit, which sits at the low word bit.
             const int ay = top + h - 7;
             svg += "<path class=\"arrow\" d=\"M" + num(x + 8) + " " + num(ay) + "H" +
@@ -482,7 +485,7 @@ private:
         std::set<std::string> names;
         for (size_t i : owners) {
             const Slice& s = file_.slices[i];
-            if (s.access.find('w') != std::string::npos) return true;
+            if (s.access().find('w') != std::string::npos) return true;
             if (!names.insert(s.registerName).second) return true;
         }
         return false;

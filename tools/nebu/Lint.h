@@ -1,37 +1,11 @@
 // `nebu lint`: checks a data directory as a whole, with the library's own file readers.
 #pragma once
 
-#include <cstdint>
 #include <iosfwd>
 #include <string>
 #include <vector>
 
 namespace nebu {
-
-struct LintProblem {
-    std::string file;  // data directory + the name the directory file gives
-    uint32_t line;     // 0: the file as a whole
-    std::string text;
-};
-
-// A line of the directory file that reaches the key columns.
-struct LintDirectoryLine {
-    uint32_t line;
-    int32_t slaveType;
-    int32_t minVersion;
-    int32_t maxVersion;
-    std::string registers;   // as the line gives it
-    std::string parameters;  // as the line gives it; may be empty
-};
-
-struct LintResult {
-    std::vector<LintDirectoryLine> directoryLines;
-    std::vector<LintProblem> problems;  // sorted by file and line
-    size_t filesRead = 0;
-};
-
-// Everything lint finds in dataDir (which ends in a separator).
-LintResult lintDataDir(const std::string& dataDir);
 
 // args: the words after "lint" ([DATA_DIR]; defaultDataDir when absent). Writes one
 // "FILE:LINE: problem" line per problem ("FILE: problem" when no line is concerned), sorted

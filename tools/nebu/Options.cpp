@@ -1,6 +1,8 @@
 // Command-line option parsing of the console.
 #include "Options.h"
 
+#include <functional>
+
 #include "CommandLine.h"
 #include "UsageError.h"
 
@@ -23,6 +25,64 @@ std::string usageText() {
            "       nebu doc [DATA_DIR] -o DIR   write its register-map pages into DIR\n";
 }
 
+namespace {
+
+// An option word: its name, and the value given with "--name=VALUE" if any.
+struct OptionWord {
+    std::string name;
+    bool hasInlineValue = false;
+    std::string inlineValue;
+
+    explicit OptionWord(const std::string& arg) : name(arg) {
+        const size_t eq = arg.find('=');
+        if (arg.compare(0, 2, "--") == 0 && eq != std::string::npos) {
+            inlineValue = arg.substr(eq + 1);
+            hasInlineValue = true;
+            name.resize(eq);
+        }
+    }
+};
+
+std::string nonEmpty(const std::string& value, const std::string& option, const char* what) {
+    if (value.empty()) throw UsageError("option " + option + " needs " + what);
+    return value;
+}
+
+// Stores one option in options; next() takes the following argument as its value.
+void applyOption(Options& options, const OptionWord& word,
+                 const std::function<std::string()>& next) {
+    const std::string& arg = word.name;
+    auto value = [&]() { return word.hasInlineValue ? word.inlineValue : next(); };
+    auto noValue = [&]() {
+        if (word.hasInlineValue) throw UsageError("option " + arg + " takes no argument");
+    };
+    if (arg == "--board") {
+        options.boardFile = nonEmpty(value(), arg, "a file name");
+    } else if (arg == "--data-dir") {
+        options.dataDir = nonEmpty(value(), arg, "a directory");
+    } else if (arg == "--plugin") {
+        options.pluginPath = nonEmpty(value(), arg, "a path");
+    } else if (arg == "--session") {
+        options.session = parseNumber(value(), "--session");
+    } else if (arg == "--trace") {
+        noValue();
+        options.trace = true;
+    } else if (arg == "--tck-mhz") {
+        options.cable.tckMhz = parseCableFigure(value(), arg, false);
+    } else if (arg == "--round-trip-us") {
+        options.cable.roundTripUs = parseCableFigure(value(), arg, true);
+    } else if (arg == "-e") {
+        options.commands.push_back(value());
+    } else if (arg == "--help" || arg == "-h") {
+        noValue();
+        options.help = true;
+    } else {
+        throw UsageError("unknown option '" + arg + "'");
+    }
+}
+
+}  // namespace
+
 Options parseOptions(const std::vector<std::string>& args) {
     Options options;
     bool scriptSeen = false;
@@ -33,7 +93,7 @@ Options parseOptions(const std::vector<std::string>& args) {
         scriptSeen = true;
     };
     for (size_t i = 0; i < args.size(); ++i) {
-        std::string arg = args[i];
+        const std::string& arg = args[i];
         if (arg == "--") {
             for (++i; i < args.size(); ++i) setScript(args[i]);
             break;
@@ -42,50 +102,12 @@ Options parseOptions(const std::vector<std::string>& args) {
             setScript(arg);
             continue;
         }
-        std::string inlineValue;
-        bool hasInlineValue = false;
-        if (arg.compare(0, 2, "--") == 0) {
-            const size_t eq = arg.find('=');
-            if (eq != std::string::npos) {
-                inlineValue = arg.substr(eq + 1);
-                hasInlineValue = true;
-                arg.resize(eq);
-            }
-        }
-        auto value = [&]() -> std::string {
-            if (hasInlineValue) return inlineValue;
-            if (i + 1 >= args.size()) throw UsageError("option " + arg + " needs an argument");
+        const OptionWord word(arg);
+        applyOption(options, word, [&]() {
+            if (i + 1 >= args.size())
+                throw UsageError("option " + word.name + " needs an argument");
             return args[++i];
-        };
-        auto noValue = [&]() {
-            if (hasInlineValue) throw UsageError("option " + arg + " takes no argument");
-        };
-        if (arg == "--board") {
-            options.boardFile = value();
-            if (options.boardFile.empty()) throw UsageError("option --board needs a file name");
-        } else if (arg == "--data-dir") {
-            options.dataDir = value();
-            if (options.dataDir.empty()) throw UsageError("option --data-dir needs a directory");
-        } else if (arg == "--plugin") {
-            options.pluginPath = value();
-            if (options.pluginPath.empty()) throw UsageError("option --plugin needs a path");
-        } else if (arg == "--session") {
-            options.session = parseNumber(value(), "--session");
-        } else if (arg == "--trace") {
-            noValue();
-            options.trace = true;
-        } else if (arg == "--tck-mhz") {
-            options.cable.tckMhz = parseCableFigure(value(), arg, false);
-        } else if (arg == "--round-trip-us") {
-            options.cable.roundTripUs = parseCableFigure(value(), arg, true);
-        } else if (arg == "-e") {
-            options.commands.push_back(value());
-        } else if (arg == "--help" || arg == "-h") {
-            noValue();
-            options.help = true;
-        } else {
-            throw UsageError("unknown option '" + arg + "'");
-        }
+        });
     }
     return options;
 }

@@ -1,33 +1,40 @@
-// The print commands: the library's own readers print the image of a definition file.
+// The print commands: the library's definition-file reader reads the file afresh and prints
+// its image, or reports why it refuses the file as the plug-in would.
 #include "PrintCommands.h"
 
 #include <ostream>
 
-#include "params/OrvNebu_DefaultParamReader.h"
-#include "registers/OrvNebu_DefaultRegisterHandler.h"
+#include "base/OrvNebu_FileProblem.h"
+#include "base/OrvNebu_ParamFile.h"
+#include "base/OrvNebu_RegisterFile.h"
 
 namespace nebu {
 
-int printRegisterFile(uint32_t handle, const std::string& path, std::ostream& out,
-                      std::ostream& /*err*/) {
-    try {
-        OrvRT::OrvNebu_DefaultRegisterHandler::readAndPrint(handle, path, out);
-        return 0;
-    } catch (...) {
-        // The reader has reported why on the session channel.
+namespace {
+
+template <class File>
+int printFile(uint32_t handle, const std::string& path, std::ostream& out) {
+    const File file(path);
+    const OrvRT::OrvNebu_FileProblem* refusal =
+        OrvRT::OrvNebu_FileProblem::firstRefusal(file.problems());
+    if (refusal != nullptr) {
+        OrvRT::OrvNebu_FileProblem::send(handle, *refusal);
         return 1;
     }
+    file.print(out);
+    return 0;
 }
 
-int printParameterFile(uint32_t /*handle*/, const std::string& path, std::ostream& out,
+}  // namespace
+
+int printRegisterFile(uint32_t handle, const std::string& path, std::ostream& out,
+                      std::ostream& /*err*/) {
+    return printFile<OrvRT::OrvNebu_RegisterFile>(handle, path, out);
+}
+
+int printParameterFile(uint32_t handle, const std::string& path, std::ostream& out,
                        std::ostream& /*err*/) {
-    // The reader reports its failures on session 0, the session it caches the file under.
-    try {
-        OrvRT::OrvNebu_DefaultParamReader::readAndPrint(path, out);
-        return 0;
-    } catch (...) {
-        return 1;
-    }
+    return printFile<OrvRT::OrvNebu_ParamFile>(handle, path, out);
 }
 
 }  // namespace nebu
