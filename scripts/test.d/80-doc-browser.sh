@@ -10,11 +10,10 @@ if [ ! -x "$dir/bin/nebu" ]; then
   configure "$dir" -DNEBU_BUILD_TESTS=OFF -DNEBU_BUILD_BENCH=OFF
   cmake --build "$dir" -j "$jobs" --target nebu
 fi
-work="$root/build-doc-browser"
 status=0
-bash "$root/tests/browser/doc_browser.sh" "$dir/bin/nebu" "$root/data" "$work" >"$root/build-doc-browser.log" 2>&1 ||
-  status=$?
+output=$(bash "$root/tests/browser/doc_browser.sh" "$dir/bin/nebu" "$root/data" \
+  "$root/build-doc-browser" 2>&1) || status=$?
 # 77: Chromium is installed but cannot start here; the script's one line says so.
-[ "$status" -eq 77 ] && skip "$(tail -1 "$root/build-doc-browser.log")"
-cat "$root/build-doc-browser.log"
+[ "$status" -eq 77 ] && skip "$(tail -1 <<<"$output")"
+echo "$output"
 exit "$status"
