@@ -189,6 +189,8 @@ TEST_F(DocTest, BadInput) {
     ASSERT_NE(row, std::string::npos);
     EXPECT_NE(index.find("Unable to open OrvNebu register file: " + dir + "missing_regs.csv", row),
               std::string::npos);
+    EXPECT_NE(index.find("<code>missing_regs.csv</code> (not read)", row), std::string::npos);
+    EXPECT_FALSE(fs::exists(site_ / "regs-missing_regs.csv.html"));
 
     std::ofstream(site_ / "notes.txt") << "mine\n";
     std::ofstream(site_ / "index.html", std::ios::app) << "<!-- edited -->\n";

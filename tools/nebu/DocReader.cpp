@@ -198,17 +198,22 @@ Site readSite(const std::string& dataDir) {
         DirectoryRow row;
         static_cast<OrvNebu_DataDirectory::Row&>(row) = r;
         row.classes = classSpans(r.slaveType, r.minDriverVersion, r.maxDriverVersion);
-        if (const OrvNebu_RegisterFile* registers = data.registerFile(r)) {
+        // A file that cannot be opened gets no page: its row shows why.
+        const OrvNebu_RegisterFile* registers = data.registerFile(r);
+        if (registers != nullptr && !registers->opened()) registers = nullptr;
+        const OrvNebu_ParamFile* params = data.paramFile(r);
+        if (params != nullptr && !params->opened()) params = nullptr;
+        if (registers != nullptr) {
             auto known = indexOf.emplace(registers, static_cast<int>(site.registerFiles.size()));
             if (known.second) site.registerFiles.push_back(registerModel(r.registers, *registers));
             row.registerIndex = known.first->second;
         }
-        if (const OrvNebu_ParamFile* params = data.paramFile(r)) {
+        if (params != nullptr) {
             auto known = indexOf.emplace(params, static_cast<int>(site.parameterFiles.size()));
             // Settings are drawn on the register file of the first row naming the file.
             if (known.second) {
                 site.parameterFiles.push_back(
-                    parameterModel(r.parameters, *params, row.registerIndex, data.registerFile(r)));
+                    parameterModel(r.parameters, *params, row.registerIndex, registers));
             }
             row.parameterIndex = known.first->second;
         }
