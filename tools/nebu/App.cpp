@@ -11,6 +11,7 @@
 #include <vector>
 
 #include "Console.h"
+#include "Doc.h"
 #include "Lint.h"
 #include "Options.h"
 #include "PluginApi.h"
@@ -47,10 +48,12 @@ int runNebu(int argc, char** argv, std::istream& in, std::ostream& out, std::ost
             bool inIsTerminal) {
     std::vector<std::string> args;
     for (int i = 1; i < argc; ++i) args.emplace_back(argv[i]);
-    if (!args.empty() && args.front() == "lint") {
+    if (!args.empty() && (args.front() == "lint" || args.front() == "doc")) {
         const std::string exeDir = executableDirectory(argc > 0 ? argv[0] : nullptr);
-        return runLint(std::vector<std::string>(args.begin() + 1, args.end()),
-                       exeDir + "/../share/orvnebu/data/", out, err);
+        const std::vector<std::string> rest(args.begin() + 1, args.end());
+        const std::string data = exeDir + "/../share/orvnebu/data/";
+        return args.front() == "lint" ? runLint(rest, data, out, err)
+                                      : runDoc(rest, data, out, err);
     }
     try {
         const Options options = parseOptions(args);

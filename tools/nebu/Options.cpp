@@ -21,7 +21,8 @@ std::string usageText() {
            "  --round-trip-us R  cost of one cable round trip in microseconds (default 125)\n"
            "  -e COMMAND       run one command (repeatable); SCRIPT runs first when given\n"
            "  SCRIPT           file of commands; without -e and SCRIPT, standard input\n"
-           "       nebu lint [DATA_DIR]   check a data directory (default: the demo data)\n";
+           "       nebu lint [DATA_DIR]   check a data directory (default: the demo data)\n"
+           "       nebu doc [DATA_DIR] -o DIR   write its register-map pages into DIR\n";
 }
 
 namespace {
