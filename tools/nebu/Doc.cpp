@@ -9,6 +9,7 @@
 
 #include "DocReader.h"
 #include "DocSite.h"
+#include "Lint.h"
 #include "UsageError.h"
 
 namespace nebu {
@@ -65,7 +66,7 @@ Options parseDocOptions(const std::vector<std::string>& args, const std::string&
     if (options.dataDir.empty() || !fs::is_directory(options.dataDir, error)) {
         throw UsageError("doc: no data directory '" + options.dataDir + "'");
     }
-    if (options.dataDir.back() != '/') options.dataDir += '/';
+    options.dataDir = asDirectoryPrefix(options.dataDir);
     return options;
 }
 
