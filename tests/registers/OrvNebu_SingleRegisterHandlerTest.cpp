@@ -122,7 +122,7 @@ TEST_F(SingleRegisterHandlerTest, ReadsNothingBeforeEveryKeyPassedThenHighestOrd
 
 TEST_F(SingleRegisterHandlerTest, AnyNonEmptyValueOfTheVariableSelectsIt) {
     // The value is not looked at: "0" selects the single-register handler too.
-    setenv("ZAN_ORV_SWITCH_REG_HANDLER", "0", 1);
+    nebutest::setEnv("ZAN_ORV_SWITCH_REG_HANDLER", "0");
     ASSERT_EQ(initialize(1), ORVNEBU_OK);
     EXPECT_EQ(OrvNebu_SingleRegisterHandler::getHandlerCount(), 2u);
     EXPECT_EQ(OrvNebu_DefaultRegisterHandler::getHandlerCount(), 0u);
