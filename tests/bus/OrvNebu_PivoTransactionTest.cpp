@@ -278,7 +278,13 @@ TEST_F(PivoTransactionTest, StatusDeliveryCostsOneErrorReadAndShowsTheBusBits) {
     ASSERT_EQ(OrvNebu_broadcastSingleWrite(H, 0, 1, 0x30, 0x4242, &status), 0u);
     EXPECT_EQ(status, 1u);
     EXPECT_EQ(jtag().back(), jtagRead(3, 6, 0x9));
-    // A reset clears the error bits.
+    // A slave reset clears its own bit, a bus reset every bit.
+    uint32_t all[4] = {0, 0, 0, 0};
+    ASSERT_EQ(OrvNebu_getBusErrorStatus(H, 0, 1, all, 4), 0u);
+    EXPECT_THAT(all, ElementsAre(1u, 5u, 1u, 1u));
+    ASSERT_EQ(OrvNebu_resetSlave(H, slave(1, 1)), 0u);
+    ASSERT_EQ(OrvNebu_getBusErrorStatus(H, 0, 1, all, 4), 0u);
+    EXPECT_THAT(all, ElementsAre(1u, 1u, 1u, 1u));
     ASSERT_EQ(OrvNebu_clearBusErrorStatus(H, 0, 1), 0u);
     ASSERT_EQ(OrvNebu_singleSlaveRead(H, slave(1, 0), 0x10, &word, &status), 0u);
     EXPECT_EQ(status, 0u);

@@ -158,20 +158,6 @@ std::vector<Fault> faults() {
              EXPECT_TRUE(t.lastMessageIs(ERR, badBus));
              EXPECT_TRUE(t.registered(1, 0));  // a failed initialize removes nothing
          }},
-        {"FaultySlave",
-         [](T& t) { t.board()->setSlaveFaulty(0, 1, 1, true); },
-         [](T& t) {
-             return OrvNebu_singleSlaveRead(H, FaultTableTest::ref(1, 1), 3, t.words, &t.status);
-         },
-         ORVNEBU_OK,
-         {},
-         [](T& t) {
-             EXPECT_EQ(t.words[0], 0x00AAu);  // the data still arrives
-             EXPECT_EQ(t.status, 4u);         // with the slave's own error bit
-             EXPECT_TRUE(t.board()->slaveErrorBit(0, 1, 1));
-             EXPECT_EQ(OrvNebu_resetSlave(H, FaultTableTest::ref(1, 1)), ORVNEBU_OK);
-             EXPECT_FALSE(t.board()->slaveErrorBit(0, 1, 1));
-         }},
         {"CommandChannelRefusesTransfers",
          [](T& t) {
              t.loadBoard(R"({ "devices": [ { "chains": { "1": { "cores": [ { "type": 3 },
