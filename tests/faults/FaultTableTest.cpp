@@ -72,12 +72,9 @@ public:
 
     static ORV_SLAVE_REF ref(uint32_t chain, uint32_t slave) { return {0, chain, slave}; }
 
-    // The caller's data: a map, a word buffer and counts, preset so that a write shows.
+    // The caller's data: a map and a count, preset so that a write shows.
     ORV_HASHMAP_HANDLE map = nullptr;
     uint32_t count = 77;
-    uint32_t words[8] = {0xDEAD, 0xDEAD, 0xDEAD, 0xDEAD, 0xDEAD, 0xDEAD, 0xDEAD, 0xDEAD};
-    uint32_t status = 0xDEAD;
-    std::vector<std::string> choices;
     TempDataDir data;
 
     std::string dir() const { return data.dir(); }
