@@ -69,6 +69,12 @@ TEST_F(RegisterValuesTest, BothHandlersMapAndMergeTheSameBits) {
             EXPECT_EQ(get(slave, row.name), row.set);
         }
     }
+    // A read of every register: the same map from either handler.
+    ORV_HASHMAP_HANDLE block = makeMap(), single = makeMap();
+    ASSERT_EQ(getRegs(0, block), ORVNEBU_OK);
+    ASSERT_EQ(getRegs(1, single), ORVNEBU_OK);
+    EXPECT_EQ(mapOf(block).size(), 8u);
+    EXPECT_EQ(mapOf(single), mapOf(block));
     EXPECT_NO_MESSAGES();
 }
 
