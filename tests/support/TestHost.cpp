@@ -41,12 +41,6 @@ std::shared_ptr<OrvSim::Board> TestHost::loadBoard(const std::string& json) {
     return board_;
 }
 
-std::shared_ptr<OrvSim::Board> TestHost::loadBoardFile(const std::string& path) {
-    board_ = OrvSim::Board::loadFile(path);
-    OrvSim::setBoard(board_);
-    return board_;
-}
-
 void TestHost::setDataDir(const std::string& dir) { OrvSim::setDataDir(dir); }
 
 std::vector<TestHost::Message> TestHost::messages() const {

@@ -41,8 +41,6 @@ protected:
 
     // Loads the board (Board::loadText) and puts it behind every session. Throws BoardError.
     std::shared_ptr<OrvSim::Board> loadBoard(const std::string& json);
-    // The same from a file (Board::loadFile), e.g. NEBU_TEST_BOARDS_DIR "/demo.json".
-    std::shared_ptr<OrvSim::Board> loadBoardFile(const std::string& path);
     std::shared_ptr<OrvSim::Board> board() const { return board_; }
     // Defaults to NEBU_TEST_DATA_DIR.
     void setDataDir(const std::string& dir);
@@ -85,7 +83,5 @@ private:
 
 // Message checks: severity and exact text.
 #define EXPECT_MESSAGE(severity, text) EXPECT_TRUE(hasMessage((severity), (text)))
-#define ASSERT_MESSAGE(severity, text) ASSERT_TRUE(hasMessage((severity), (text)))
 #define EXPECT_LAST_MESSAGE(severity, text) EXPECT_TRUE(lastMessageIs((severity), (text)))
-#define ASSERT_LAST_MESSAGE(severity, text) ASSERT_TRUE(lastMessageIs((severity), (text)))
 #define EXPECT_NO_MESSAGES() EXPECT_TRUE(noMessages())

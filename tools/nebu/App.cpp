@@ -12,6 +12,7 @@
 
 #include "Check.h"
 #include "Console.h"
+#include "Doc.h"
 #include "Lint.h"
 #include "Options.h"
 #include "PluginApi.h"
@@ -75,9 +76,11 @@ int runNebu(int argc, char** argv, std::istream& in, std::ostream& out, std::ost
     std::vector<std::string> args;
     for (int i = 1; i < argc; ++i) args.emplace_back(argv[i]);
     const std::string exeDir = executableDirectory(argc > 0 ? argv[0] : nullptr);
-    if (!args.empty() && args.front() == "lint") {
-        return runLint(std::vector<std::string>(args.begin() + 1, args.end()),
-                       exeDir + "/../share/orvnebu/data/", out, err);
+    if (!args.empty() && (args.front() == "lint" || args.front() == "doc")) {
+        const std::vector<std::string> rest(args.begin() + 1, args.end());
+        const std::string data = exeDir + "/../share/orvnebu/data/";
+        return args.front() == "lint" ? runLint(rest, data, out, err)
+                                      : runDoc(rest, data, out, err);
     }
     if (!args.empty() && args.front() == "check") {
         return runCheck(std::vector<std::string>(args.begin() + 1, args.end()), exeDir, out, err);

@@ -49,13 +49,7 @@ int parseArguments(const std::vector<std::string>& args, std::string& dataDir, s
         err << "nebu: lint: no data directory '" << dataDir << "'" << std::endl;
         return 2;
     }
-#if defined(_WIN32)
-    const bool separated = dataDir.back() == '/' || dataDir.back() == '\\';
-#else
-    const bool separated = dataDir.back() == '/';
-#endif
-    // '/' joins on Windows too, as the stand-in host joins the data directory.
-    if (!separated) dataDir += '/';
+    dataDir = asDirectoryPrefix(dataDir);
     return -1;
 }
 
@@ -72,6 +66,16 @@ void printProblem(const OrvNebu_FileProblem& p, std::ostream& out) {
 }
 
 }  // namespace
+
+std::string asDirectoryPrefix(std::string dir) {
+#if defined(_WIN32)
+    const bool separated = !dir.empty() && (dir.back() == '/' || dir.back() == '\\');
+#else
+    const bool separated = !dir.empty() && dir.back() == '/';
+#endif
+    if (!separated) dir += '/';
+    return dir;
+}
 
 int runLint(const std::vector<std::string>& args, const std::string& defaultDataDir,
             std::ostream& out, std::ostream& err) {

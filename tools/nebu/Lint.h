@@ -7,6 +7,10 @@
 
 namespace nebu {
 
+// dir with a separator at its end, ready for a file name: '/' joins on Windows too, as the
+// stand-in host joins the data directory, and there a trailing backslash serves as well.
+std::string asDirectoryPrefix(std::string dir);
+
 // args: the words after "lint" ([DATA_DIR]; defaultDataDir when absent). Writes one
 // "FILE:LINE: problem" line per problem ("FILE: problem" when no line is concerned), sorted
 // by file and line, then a summary line, on out. Returns 0 when clean, 1 with problems, 2 for

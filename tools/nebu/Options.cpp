@@ -22,7 +22,8 @@ std::string usageText() {
            "  -e COMMAND       run one command (repeatable); SCRIPT runs first when given\n"
            "  SCRIPT           file of commands; without -e and SCRIPT, standard input\n"
            "       nebu lint [DATA_DIR]   check a data directory (default: the demo data)\n"
-           "       nebu check [--update] TRANSCRIPT...   run transcripts of sessions again\n";
+           "       nebu check [--update] TRANSCRIPT...   run transcripts of sessions again\n"
+           "       nebu doc [DATA_DIR] -o DIR   write its register-map pages into DIR\n";
 }
 
 namespace {
