@@ -95,7 +95,7 @@ protected:
     }
 };
 
-TEST_F(BusListTest, DiscoveryFindsTheMasterCountsItsSlavesAndResetsTheBus) {
+TEST_F(BusListTest, DiscoveryFindsTheFirstMasterResetsItsBusAndKeepsItPerChain) {
     EXPECT_EQ(slaveCount(1, 0, 1), 4u);
     EXPECT_THAT(jtag(),
                 ElementsAre("jtag status device=0 chain=1 core=0 type=3",
@@ -103,25 +103,16 @@ TEST_F(BusListTest, DiscoveryFindsTheMasterCountsItsSlavesAndResetsTheBus) {
                             "jtag status device=0 chain=1 core=1 type=14", jtagWrite(1, 6, 0x3F),
                             jtagWrite(1, 6, 0x3E), jtagRead(2, 4, 0x2), jtagWrite(1, 6, 0x00)));
     EXPECT_TRUE(messages().empty());
+    // Of two masters the lower-indexed one wins: the scan stops, its commands carry 3 + 2 bits.
+    EXPECT_EQ(slaveCount(1, 0, 4), 3u);
+    EXPECT_EQ(countLines("jtag status device=0 chain=4 core=2"), 0u);
+    EXPECT_EQ(countLines(jtagWrite(1, 5, 0x1F)), 1u) << joined();
+    EXPECT_EQ(slaveCount(1, 0, 2), 2u);
 
-    // The bus is now known: no more device access to find it.
+    // Known buses need no more device access to be found; two chains are two buses.
     clearLog();
     EXPECT_EQ(touch(1, 0, 1), 0u);
     EXPECT_TRUE(jtag().empty());
-}
-
-TEST_F(BusListTest, TheLowerIndexedOfTwoMastersWins) {
-    EXPECT_EQ(slaveCount(1, 0, 4), 3u);
-    EXPECT_EQ(countLines("jtag status device=0 chain=4 core=2"), 0u) << "the scan stops";
-    // Its commands carry 3 + 2 reset bits.
-    EXPECT_EQ(countLines(jtagWrite(1, 5, 0x1F)), 1u) << joined();
-}
-
-TEST_F(BusListTest, TwoChainsAreTwoBuses) {
-    EXPECT_EQ(slaveCount(1, 0, 1), 4u);
-    EXPECT_EQ(slaveCount(1, 0, 2), 2u);
-    clearLog();
-
     uint32_t word = 0;
     ASSERT_EQ(OrvNebu_singleSlaveRead(1, {0, 1, 0}, 0x10, &word, nullptr), 0u);
     EXPECT_EQ(word, 0x0101u);
@@ -147,50 +138,42 @@ TEST_F(BusListTest, SlaveCountRediscoversEveryTime) {
     EXPECT_EQ(countLines(jtagWrite(1, 4, 0xF)), 1u) << joined();
 }
 
-TEST_F(BusListTest, ABusThatDisappearsIsForgotten) {
-    EXPECT_EQ(slaveCount(1, 0, 1), 4u);
-    loadBoard(BOARD_NO_MASTER);
-    EXPECT_EQ(slaveCount(1, 0, 1), 0u);
-    clearLog();
-    EXPECT_EQ(OrvNebu_resetBus(1, 0, 1), FAILED);
-    expectOnlyMessage(256, "Invalid NEBU Bus Device:0, user chain number/bus:1.");
-}
-
 TEST_F(BusListTest, NoUsableBusCountsZeroAndCannotBeUsed) {
+    const char* zero = R"({ "devices": [ { "chains": {
+        "1": { "cores": [ { "type": 14, "master": { "slaveCount": 0 } } ] } } } ] })";
     struct Case {
         uint32_t device, userChain;
-        std::string message;
+        const char* board;  // after a first discovery on BOARD, if any
     };
     const Case cases[] = {
-        {0, 3, "Invalid NEBU Bus Device:0, user chain number/bus:3."},  // 0 slave positions
-        {0, 5, "Invalid NEBU Bus Device:0, user chain number/bus:5."},  // no cores
-        {1, 1, "Invalid NEBU Bus Device:1, user chain number/bus:1."},  // configuration controller
-        {4294967295u, 4000000000u,
-         "Invalid NEBU Bus Device:4294967295, user chain number/bus:4000000000."},  // no device
+        {0, 3, nullptr},                      // 0 slave positions
+        {0, 5, nullptr},                      // no cores
+        {1, 1, nullptr},                      // configuration controller, never probed
+        {4294967295u, 4000000000u, nullptr},  // no device
+        {0, 1, BOARD_NO_MASTER},              // a bus that disappears is forgotten
+        {0, 1, zero},                         // one without positions replaces an earlier one
     };
     for (const Case& c : cases) {
-        SCOPED_TRACE(c.message);
+        const std::string message = "Invalid NEBU Bus Device:" + std::to_string(c.device) +
+                                    ", user chain number/bus:" + std::to_string(c.userChain) + ".";
+        SCOPED_TRACE(message);
+        loadBoard(BOARD);
+        if (c.board != nullptr) {
+            EXPECT_EQ(slaveCount(1, c.device, c.userChain), 4u);
+            loadBoard(c.board);
+        }
         clearLog();
         EXPECT_EQ(slaveCount(1, c.device, c.userChain), 0u);
         EXPECT_TRUE(messages().empty());
+        if (c.device == 1) {
+            EXPECT_TRUE(jtag().empty());
+        }
         EXPECT_EQ(OrvNebu_resetBus(1, c.device, c.userChain), FAILED);
-        expectOnlyMessage(256, c.message);
+        expectOnlyMessage(256, message);
+        clearLog();
+        EXPECT_EQ(touch(1, c.device, c.userChain), FAILED);
+        expectOnlyMessage(256, message);
     }
-    // A configuration controller is never probed.
-    clearLog();
-    EXPECT_EQ(slaveCount(1, 1, 1), 0u);
-    EXPECT_TRUE(jtag().empty());
-}
-
-TEST_F(BusListTest, ABusWithoutPositionsReplacesAnEarlierOne) {
-    EXPECT_EQ(slaveCount(1, 0, 1), 4u);
-    const char* zero = R"({ "devices": [ { "chains": {
-        "1": { "cores": [ { "type": 14, "master": { "slaveCount": 0 } } ] } } } ] })";
-    loadBoard(zero);
-    EXPECT_EQ(slaveCount(1, 0, 1), 0u);
-    clearLog();
-    EXPECT_EQ(touch(1, 0, 1), FAILED);
-    expectOnlyMessage(256, "Invalid NEBU Bus Device:0, user chain number/bus:1.");
 }
 
 TEST_F(BusListTest, AConfigurationControllerLeavesTheListAlone) {
@@ -279,20 +262,6 @@ TEST_F(BusListTest, ACallKeepsItsBusWhileItsSessionEnds) {
     ASSERT_TRUE(ending.joinable());
     ending.join();
     EXPECT_EQ(board()->lastResetControl(0, 1), std::vector<uint8_t>{0}) << "the reset completed";
-}
-
-TEST_F(BusListTest, AFailedResetKeepsTheNewBus) {
-    const char* stuck = R"({ "devices": [ { "chains": {
-        "1": { "cores": [ { "type": 14, "master": { "slaveCount": 1, "resetPolls": -1 } } ] }
-        } } ] })";
-    loadBoard(stuck);
-    uint32_t count = 77;
-    EXPECT_EQ(OrvNebu_getSlaveCount(1, 0, 1, &count), FAILED);
-    EXPECT_EQ(count, 77u);
-    expectOnlyMessage(256, "NEBU Master timed out.\n");
-    clearLog();
-    EXPECT_EQ(touch(1, 0, 1), 0u);
-    EXPECT_TRUE(jtag().empty()) << "found without a second reset";
 }
 
 }  // namespace
