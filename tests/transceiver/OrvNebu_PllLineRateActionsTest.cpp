@@ -131,6 +131,8 @@ TEST_F(M3QrcChannel, SettingWritesWindowsAndBothOutputDividers) {
     slave.setParameters(1, slave.getSlaveRef(), &params);
     EXPECT_EQ("3816", slave.memory["TXUSRCLK_FREQ_TUNE0"]);  // 10 * 224000 / 156
     EXPECT_EQ("3816", slave.memory["RXRECCLK_FREQ_TUNE0"]);
+    EXPECT_EQ("3816", slave.memory["RXUSRCLK_FREQ_TUNE0"]);
+    EXPECT_EQ("3816", slave.memory["TXOUTCLK_FREQ_TUNE0"]);
     EXPECT_EQ("702D", slave.memory["TXUSRCLK2_FREQ_TUNE0"]);  // 10 * 224000 / 78
     EXPECT_EQ("702D", slave.memory["RXUSRCLK2_FREQ_TUNE0"]);
     EXPECT_EQ("2", slave.memory["TXOUT0"]);
@@ -197,7 +199,11 @@ TEST(PllLineRateChoiceString, FormatAndReading) {
     EXPECT_TRUE(OrvNebu_PllLineRateParamAction::readLineRateChoiceString(fb, ref, divsel, rate,
                                                                          "10,a=3 b=4 c=5"));
     EXPECT_EQ(5u, divsel);
-    for (const char* bad : {"foo", "100 FB=1, REF=2, DIVSEL=", "100 FB=x, REF=2, DIVSEL=3", ""}) {
+    EXPECT_TRUE(OrvNebu_PllLineRateParamAction::readLineRateChoiceString(
+        fb, ref, divsel, rate, "9.5e+2 FB=1, REF=1, DIVSEL=1"));
+    EXPECT_EQ(950.0, rate);
+    for (const char* bad : {"foo", "100 FB=1, REF=2, DIVSEL=", "100 FB=x, REF=2, DIVSEL=3", "",
+                            "FB=1, REF=2, DIVSEL=3", ".e1 FB=1, REF=2, DIVSEL=3"}) {
         EXPECT_FALSE(
             OrvNebu_PllLineRateParamAction::readLineRateChoiceString(fb, ref, divsel, rate, bad));
         EXPECT_EQ(0u, fb + ref + divsel) << bad;
@@ -260,6 +266,10 @@ TEST_F(R3QraDual, ChoicesWithAndWithoutOversampling) {
                   "480.000 FB=2, REF=1, DIVSEL=1", "1200.000 FB=2, REF=1, DIVSEL=2",
                   "240.000 FB=2, REF=1, DIVSEL=2", "480.000 FB=4, REF=1, DIVSEL=2"}),
               choices("120"));
+    // 481.0 itself is listed.
+    slave.memory["MAX_LINERATE"] = "0";
+    EXPECT_EQ("481.000 FB=2, REF=1, DIVSEL=1", choices("120.25").at(1));
+    slave.memory["MAX_LINERATE"] = "77359400";
     // 2500.0 is over the maximum and its fifth, 500.0, over 481.0.
     std::vector<std::string> list = choices("125");
     EXPECT_EQ("1250.000 FB=2, REF=1, DIVSEL=2", list.at(0));

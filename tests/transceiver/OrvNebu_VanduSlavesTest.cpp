@@ -71,6 +71,7 @@ void expectAsTheTableSays(OrvRT::OrvNebu_SlaveClassTable::SlaveClass slaveClass)
         const auto& described = info.actions[i];
         OrvNebu_ParamAction* action = slave.getParamAction(described.parameters.front());
         ASSERT_NE(action, nullptr) << described.className;
+        EXPECT_EQ(described.parameters.front(), action->getParamName());
         EXPECT_EQ(OrvRT::OrvNebu_SlaveClassTable::START_PRIORITY + i, action->getPriority());
         EXPECT_EQ(std::set<std::string>(described.parameters.begin(), described.parameters.end()),
                   std::set<std::string>(action->getParamNames()->begin(),
