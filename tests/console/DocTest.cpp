@@ -192,11 +192,11 @@ TEST_F(DocTest, BadInput) {
     EXPECT_NE(index.find("<code>missing_regs.csv</code> (not read)", row), std::string::npos);
     EXPECT_FALSE(fs::exists(site_ / "regs-missing_regs.csv.html"));
 
-    std::ofstream(site_ / "notes.txt") << "mine\n";
+    std::ofstream(site_ / "notes.txt", std::ios::binary) << "mine\n";
     std::ofstream(site_ / "index.html", std::ios::app) << "<!-- edited -->\n";
     ASSERT_EQ(run({"doc", DEMO, "-o", out}).status, 0);
     EXPECT_FALSE(has("index.html", "edited"));
-    std::ofstream(site_ / "style.css", std::ios::trunc) << "body { color: red }\n";
+    std::ofstream(site_ / "style.css", std::ios::binary | std::ios::trunc) << "body { color: red }\n";
     std::ofstream(root_ / "file") << "x";
     const std::string blocked = (root_ / "file" / "site").string();
     const std::pair<std::vector<std::string>, std::string> cases[] = {
@@ -205,8 +205,8 @@ TEST_F(DocTest, BadInput) {
         {{"doc", DEMO, "-o", blocked},
          "doc: cannot make output directory '" + blocked + "': Not a directory"},
         {{"doc", DEMO, "-o", out},
-         "doc: " + out +
-             "/style.css was not written by nebu doc; it is left alone "
+         "doc: " + (site_ / "style.css").string() +
+             " was not written by nebu doc; it is left alone "
              "and nothing is written"},
     };
     const std::string before = page("index.html");
