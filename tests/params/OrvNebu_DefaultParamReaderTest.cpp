@@ -171,7 +171,9 @@ TEST_F(ParamReader, MalformedRowsAreReportedWithTheirLine) {
         EXPECT_THROW(load(path), Orv_AbortException);
         std::vector<Said> got = said();
         ASSERT_EQ(c.first ? 2u : 1u, got.size());
-        if (c.first == ORDER) EXPECT_EQ((Said{SESSION, 256, ORDER}), got[0]);
+        if (c.first == ORDER) {
+            EXPECT_EQ((Said{SESSION, 256, ORDER}), got[0]);
+        }
         if (c.first != nullptr && c.first != ORDER) {
             EXPECT_EQ(256u, got[0].severity);
             EXPECT_NE(std::string::npos, got[0].text.find(c.first)) << got[0].text;

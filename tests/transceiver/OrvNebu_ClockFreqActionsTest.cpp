@@ -80,9 +80,13 @@ TEST(ClockFreqActions, OutputsFromCounterWindowAndSystemClock) {
             error = std::string("!") + e.what();
         }
         EXPECT_EQ(row.size, params.size());
-        if (row.expected == nullptr || row.expected[0] != '!') EXPECT_EQ("(none)", error);
+        if (row.expected == nullptr || row.expected[0] != '!') {
+            EXPECT_EQ("(none)", error);
+        }
         if (row.expected == nullptr) continue;
         EXPECT_EQ(row.expected, row.expected[0] == '!' ? error : params[row.name]);
-        if (row.expected[0] == '!') EXPECT_EQ("kept", params[row.name]);
+        if (row.expected[0] == '!') {
+            EXPECT_EQ("kept", params[row.name]);
+        }
     }
 }

@@ -43,20 +43,18 @@ jtag write cmd=5 bits=19 data=0x20022
 jtag write cmd=6 bits=50 data=0x0ABCD12345678
 jtag flush
 rc=0x00000000
-> peek 0 1 1 0x22 3
-peek=0x5678 0x1234 0xABCD
 > write 0 1 1 0x25 1 BEEF
 jtag write cmd=4 bits=29 data=0x00100000
 jtag write cmd=5 bits=19 data=0x20025
 jtag write cmd=6 bits=18 data=0x0BEEF
 jtag flush
 rc=0x00000000
-> read 0 1 1 0x24 2
-jtag write cmd=4 bits=29 data=0x00160002
-jtag write cmd=5 bits=19 data=0x00024
-jtag read cmd=6 bits=32 data=0xBEEFABCD
+> read 0 1 1 0x22 3
+jtag write cmd=4 bits=29 data=0x00160003
+jtag write cmd=5 bits=19 data=0x00022
+jtag read cmd=6 bits=48 data=0xABCD12345678
 rc=0x00000000
-data=BEEFABCD
+data=ABCD12345678
 > read 0 1 1 0x25 1
 jtag write cmd=4 bits=29 data=0x00100000
 jtag write cmd=5 bits=19 data=0x00025
