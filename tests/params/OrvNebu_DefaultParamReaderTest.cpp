@@ -239,7 +239,9 @@ TEST_F(ParamReader, SharedWithinASessionReadAgainInAnother) {
     EXPECT_EQ(first, second);
     EXPECT_EQ(2u, choice(second, "MODE").getChoiceList().size());
 
+    const uint64_t registrations = OrvSim::listenerRegistrations();
     OrvNebu_ActionsMap other = load(path, OTHER_SESSION);
+    EXPECT_EQ(registrations, OrvSim::listenerRegistrations()) << "registered once, not per read";
     EXPECT_NE(first.at("MODE"), other.at("MODE"));
     EXPECT_EQ(1u, choice(other, "MODE").getChoiceList().size());
     EXPECT_EQ(0u, other.count("LEVEL"));
