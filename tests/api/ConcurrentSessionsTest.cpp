@@ -53,9 +53,8 @@ TEST_F(ConcurrentSessions, ThreeSessionsDiscoverInitializeReadAndEndAtOnce) {
     std::atomic<uint32_t> failures(0);
     std::vector<std::thread> threads;
     for (uint32_t device = 0; device < 3; ++device) {
-        threads.emplace_back([device, &failures] {
-            failures += sessionWork(7001 + device, device, ROUNDS);
-        });
+        threads.emplace_back(
+            [device, &failures] { failures += sessionWork(7001 + device, device, ROUNDS); });
     }
     for (std::thread& t : threads) t.join();
     EXPECT_EQ(0u, failures.load());

@@ -43,21 +43,15 @@ TEST_F(FrameTest, ExceptionsBecomeOneMessageWithTheirSeverity) {
     };
     for (const Case& c : cases) {
         SCOPED_TRACE(c.name);
-        clearLog();
-        EXPECT_EQ(lockedFrame(3, c.body), FAILED);
-        auto sent = messages();
-        ASSERT_EQ(sent.size(), 1u);
-        EXPECT_EQ(sent[0].handle, 3u);
-        EXPECT_EQ(sent[0].severity, c.severity);
-        EXPECT_EQ(sent[0].text, c.text);
-
-        clearLog();
-        EXPECT_EQ(unlockedFrame(4, c.body), FAILED);
-        sent = messages();
-        ASSERT_EQ(sent.size(), 1u);
-        EXPECT_EQ(sent[0].handle, 4u);
-        EXPECT_EQ(sent[0].severity, c.severity);
-        EXPECT_EQ(sent[0].text, c.text);
+        for (uint32_t h : {3u, 4u}) {
+            clearLog();
+            EXPECT_EQ(h == 3 ? lockedFrame(h, c.body) : unlockedFrame(h, c.body), FAILED);
+            auto sent = messages();
+            ASSERT_EQ(sent.size(), 1u);
+            EXPECT_EQ(sent[0].handle, h);
+            EXPECT_EQ(sent[0].severity, c.severity);
+            EXPECT_EQ(sent[0].text, c.text);
+        }
     }
     clearLog();
     EXPECT_EQ(lockedFrame(3, [] {}), 0u);

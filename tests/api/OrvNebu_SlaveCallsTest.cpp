@@ -1,6 +1,5 @@
 // The exported slave calls: identity words, initialize/terminate, the frame's checks, and raw
 // reads and writes as hexadecimal text.
-#include <cstring>
 
 #include "host/OrvCore.h"
 #include "registers/OrvNebu_DefaultRegisterHandler.h"
@@ -140,60 +139,13 @@ TEST_F(SlaveCallsTest, RegisterCallsResolveTheSlaveBeforeCheckingTheMap) {
                         "number/bus:1, slave index:3.");
 }
 
-TEST_F(SlaveCallsTest, ReadGivesTheHighestWordFirst) {
-    poke(1, 0x10, 0x0001);
-    poke(1, 0x11, 0x0002);
-    poke(1, 0x12, 0x1A2B);
-    watchBus();
-    char text[16];
-    std::memset(text, 'x', sizeof text);
-    ASSERT_EQ(OrvNebu_read(HANDLE, ref(1), 0x10, 2, text), ORVNEBU_OK);
-    EXPECT_STREQ(text, "00020001");
-    ASSERT_EQ(OrvNebu_read(HANDLE, ref(1), 0x12, 1, text), ORVNEBU_OK);
-    EXPECT_STREQ(text, "1A2B");
-    auto t = transfers();
-    ASSERT_EQ(t.size(), 2u);
-    EXPECT_TRUE(t[0].burst);
-    EXPECT_EQ(t[0].count, 2u);
-    EXPECT_FALSE(t[1].burst);
-    EXPECT_EQ(t[1].address, 0x12u);
-}
-
-TEST_F(SlaveCallsTest, WriteIsTheInverseOfRead) {
-    watchBus();
-    ASSERT_EQ(OrvNebu_write(HANDLE, ref(1), 0x20, 2, "00020001"), ORVNEBU_OK);
-    EXPECT_EQ(peek(1, 0x20), 0x0001);
-    EXPECT_EQ(peek(1, 0x21), 0x0002);
-    ASSERT_EQ(OrvNebu_write(HANDLE, ref(1), 0x22, 3, "abcd12345678"), ORVNEBU_OK);
-    EXPECT_EQ(peek(1, 0x22), 0x5678);
-    EXPECT_EQ(peek(1, 0x23), 0x1234);
-    EXPECT_EQ(peek(1, 0x24), 0xABCD);
-    ASSERT_EQ(OrvNebu_write(HANDLE, ref(1), 0x25, 1, "BEEF"), ORVNEBU_OK);
-    EXPECT_EQ(peek(1, 0x25), 0xBEEF);
-    auto t = transfers();
-    ASSERT_EQ(t.size(), 3u);
-    EXPECT_TRUE(t[0].burst && t[0].write);
-    EXPECT_EQ(t[0].count, 2u);
-    EXPECT_EQ(t[1].count, 3u);
-    EXPECT_FALSE(t[2].burst);  // one word: a single write
-    EXPECT_TRUE(t[2].write);
-
-    char text[13];
-    ASSERT_EQ(OrvNebu_read(HANDLE, ref(1), 0x22, 3, text), ORVNEBU_OK);
-    EXPECT_STREQ(text, "ABCD12345678");
-    EXPECT_NO_MESSAGES();
-}
-
+// Raw reads and writes themselves are in the trace transcript.
 TEST_F(SlaveCallsTest, RawCallsCheckTheirArguments) {
     char text[8];
-    EXPECT_EQ(OrvNebu_read(HANDLE, ref(1), 0, 0, text), ORVNEBU_FAILED);
-    EXPECT_LAST_MESSAGE(256, "OrvNebu_read() argument checking failed:(data != 0) && (size != 0)");
     EXPECT_EQ(OrvNebu_read(HANDLE, ref(1), 0, 1, nullptr), ORVNEBU_FAILED);
     EXPECT_LAST_MESSAGE(256, "OrvNebu_read() argument checking failed:(data != 0) && (size != 0)");
     EXPECT_EQ(OrvNebu_write(HANDLE, ref(1), 0, 2, nullptr), ORVNEBU_FAILED);
     EXPECT_LAST_MESSAGE(256, "OrvNebu_write() argument checking failed:(data != 0) && (size != 0)");
-    EXPECT_EQ(OrvNebu_write(HANDLE, ref(1), 0, 2, "0002000"), ORVNEBU_FAILED);
-    EXPECT_LAST_MESSAGE(256, "OrvNebu_write() argument checking failed:strlen(data) == (size*4)");
 
     // Sizes whose character count does not fit 32 bits: refused, nothing written or read.
     watchBus();
@@ -202,13 +154,6 @@ TEST_F(SlaveCallsTest, RawCallsCheckTheirArguments) {
     EXPECT_EQ(OrvNebu_write(HANDLE, ref(1), 0, 0x40000000u, ""), ORVNEBU_FAILED);
     EXPECT_LAST_MESSAGE(256, "OrvNebu_write() argument checking failed:size*4+1 overflows 32 bits");
     EXPECT_TRUE(trace().empty());
-
-    // Text that is no hexadecimal number writes nothing.
-    poke(1, 0, 0x1111);
-    EXPECT_EQ(OrvNebu_write(HANDLE, ref(1), 0, 1, "12G4"), ORVNEBU_FAILED);
-    EXPECT_EQ(lastMessage().severity, 256u);
-    EXPECT_TRUE(trace().empty());
-    EXPECT_EQ(peek(1, 0), 0x1111);
 }
 
 }  // namespace

@@ -4,6 +4,7 @@
 
 #include <filesystem>
 #include <fstream>
+#include <iterator>
 #include <memory>
 #include <string>
 #include <vector>
@@ -23,44 +24,11 @@ namespace {
 constexpr uint32_t SESSION = TestHost::HANDLE;
 constexpr uint32_t FAILED = 0x80000000u;
 const ORV_SLAVE_REF CTRL = {0, 1, 0};      // type 0x11: register and parameter file
-const ORV_SLAVE_REF PLAIN = {0, 1, 1};     // type 0x12: no parameter file
 const ORV_SLAVE_REF RECORDED = {0, 1, 2};  // registered by the test with extra actions
 const ORV_SLAVE_REF CTRL2 = {0, 1, 3};     // type 0x11 again
 
-const char* const BOARD = R"({"devices": [{"chains": {"1": {"cores": [{"type": 3},
-  {"type": 14, "master": {"slaveCount": 4, "slaves": {
-    "0": {"slaveType": "0x11", "driverVersion": 1,
-          "memory": {"0x0000": ["0x00D1", "0x0005", "0x001F"]}},
-    "1": {"slaveType": "0x12", "driverVersion": 1, "memory": {"0x0000": "0x0001"}},
-    "2": {"slaveType": "0x11", "driverVersion": 1, "memory": {"0x0001": "0x000C"}},
-    "3": {"slaveType": "0x11", "driverVersion": 1}
-  }}}]}}}]})";
-
-const char* const DIRECTORY =
-    "slave_type,orv_drv_ver_min,orv_drv_ver_max,registers,parameters\n"
-    "0x11,1,1,regs.csv,params.csv\n"
-    "0x12,1,1,regs.csv,\n";
-
-// EN: word 0 bit 0; SEL: word 0 bits 5..4; LVL: word 1 bits 3..0; WIDE: word 2, 16 bits.
-const char* const REGISTERS =
-    "name,address,order,start,end,text,access,notes,include\n"
-    "EN,0,0,0,0,enable,rw,,y\n"
-    "SEL,0,0,4,5,select,rw,,y\n"
-    "LVL,1,0,0,3,level,rw,,y\n"
-    "WIDE,2,0,0,15,count,rw,,y\n";
-
-const char* const PARAMETERS =
-    "param,index,choice,settings\n"
-    "MODE,0,Off,EN=0\n"
-    "MODE,1,On,EN=1,SEL=01\n"
-    "MODE,2,Fast,EN=1,SEL=10\n"
-    "MODE,3,Same,EN=1,SEL=01\n"
-    "LEVEL,0,Low,LVL=0000\n"
-    "LEVEL,1,Mid,LVL=0101\n"
-    "LEVEL,2,High,LVL=1111\n"
-    "COUNT,0,Small,WIDE=11111\n"
-    "COUNT,1,Zero,WIDE=\n"
-    "COUNT,2,Other,\n";
+// The board and data files of the slave_params transcript.
+const std::filesystem::path FILES = std::filesystem::path(NEBU_TEST_FILES_DIR) / "engine";
 
 struct Said {
     uint32_t severity;
@@ -135,11 +103,12 @@ protected:
                ("nebu_engine_" + std::to_string(::testing::UnitTest::GetInstance()->random_seed()) +
                 "_" + ::testing::UnitTest::GetInstance()->current_test_info()->name());
         std::filesystem::create_directories(dir_);
-        write("orvnebu_directory.csv", DIRECTORY);
-        write("regs.csv", REGISTERS);
-        write("params.csv", PARAMETERS);
+        for (const char* name : {"orvnebu_directory.csv", "regs.csv", "params.csv"}) {
+            std::filesystem::copy_file(FILES / name, dir_ / name);
+        }
         setDataDir(dir_.string());
-        board_ = loadBoard(BOARD);
+        std::ifstream board(FILES / "board.json");
+        board_ = loadBoard(std::string(std::istreambuf_iterator<char>(board), {}));
     }
 
     void TearDown() override {
@@ -225,106 +194,7 @@ protected:
 
 }  // namespace
 
-TEST_F(DefaultSlaveParams, ReadingNamesTheFirstMatchingChoice) {
-    initialize(CTRL);
-    // Word 0 = 0xD1: EN 1, SEL 01 (On and Same match; On has the lower index).
-    EXPECT_EQ((Orv_HashMapCStr{{"MODE", "On"}}), get(CTRL, {{"MODE", "ignored"}}));
-    // One read round trip for the whole request.
-    EXPECT_EQ(1u, OrvSim::takeStats(SESSION).roundTrips);
-    EXPECT_EQ((Orv_HashMapCStr{{"MODE", "On"}, {"LEVEL", "Mid"}, {"COUNT", "Small"}}),
-              get(CTRL, {{"MODE", ""}, {"LEVEL", ""}, {"COUNT", ""}}));
-    // Everything when nothing particular is asked for.
-    EXPECT_EQ((Orv_HashMapCStr{{"MODE", "On"}, {"LEVEL", "Mid"}, {"COUNT", "Small"}}),
-              get(CTRL, {}));
-
-    // 001F read back matches the setting written as 11111 (1F); 0000 matches the empty
-    // setting; a value no choice holds reads as the empty text.
-    board_->poke(0, 1, 0, 0, 0x0020);
-    board_->poke(0, 1, 0, 1, 0x0003);
-    board_->poke(0, 1, 0, 2, 0x0000);
-    EXPECT_EQ((Orv_HashMapCStr{{"MODE", "Off"}, {"LEVEL", ""}, {"COUNT", "Zero"}}), get(CTRL, {}));
-    // A choice without settings matches anything it reaches.
-    board_->poke(0, 1, 0, 2, 0x1234);
-    EXPECT_EQ("Other", get(CTRL, {{"COUNT", ""}}).at("COUNT"));
-    board_->poke(0, 1, 0, 0, 0x0021);
-    EXPECT_EQ("Fast", get(CTRL, {{"MODE", ""}}).at("MODE"));
-    EXPECT_TRUE(takeMessages().empty());
-}
-
-TEST_F(DefaultSlaveParams, SettingWritesTheChoiceAndKeepsOtherBits) {
-    initialize(CTRL);
-    board_->poke(0, 1, 0, 0, 0xFF00);
-    // Any letter case names the choice; bits outside EN and SEL stay.
-    EXPECT_EQ(ORVNEBU_OK, set(CTRL, {{"MODE", "FAST"}}));
-    EXPECT_EQ(0xFF21, word(0, 0));
-    // One read and one flushed write.
-    EXPECT_EQ(2u, OrvSim::takeStats(SESSION).roundTrips);
-
-    // Off sets EN alone: SEL keeps its bits.
-    EXPECT_EQ(ORVNEBU_OK, set(CTRL, {{"MODE", "off"}}));
-    EXPECT_EQ(0xFF20, word(0, 0));
-
-    // Two parameters in one call: one read and one write of the words they cover.
-    OrvSim::takeStats(SESSION);
-    EXPECT_EQ(ORVNEBU_OK, set(CTRL, {{"MODE", "On"}, {"COUNT", "small"}}));
-    EXPECT_EQ(0xFF11, word(0, 0));
-    EXPECT_EQ(0x001F, word(0, 2));
-    EXPECT_EQ(0x0005, word(0, 1));
-    EXPECT_EQ(2u, OrvSim::takeStats(SESSION).roundTrips);
-    EXPECT_EQ((Orv_HashMapCStr{{"MODE", "On"}, {"COUNT", "Small"}}),
-              get(CTRL, {{"MODE", ""}, {"COUNT", ""}}));
-
-    // An empty-width setting writes zero.
-    EXPECT_EQ(ORVNEBU_OK, set(CTRL, {{"COUNT", "Zero"}}));
-    EXPECT_EQ(0x0000, word(0, 2));
-    EXPECT_TRUE(takeMessages().empty());
-}
-
-TEST_F(DefaultSlaveParams, NothingIsWrittenForEmptyOrUnknownValues) {
-    initialize(CTRL);
-    // The empty value, and a choice without settings, write nothing at all.
-    EXPECT_EQ(ORVNEBU_OK, set(CTRL, {{"MODE", ""}}));
-    EXPECT_EQ(ORVNEBU_OK, set(CTRL, {{"COUNT", "other"}}));
-    EXPECT_EQ(0u, OrvSim::takeStats(SESSION).commands);
-    EXPECT_TRUE(takeMessages().empty());
-
-    // An unknown choice fails before anything is written, also the valid request beside it.
-    EXPECT_EQ(FAILED, set(CTRL, {{"MODE", "Fast"}, {"LEVEL", "Max"}}));
-    EXPECT_EQ((std::vector<Said>{
-                  {256, "Setting Parameter 'LEVEL' to value 'Max' is not a valid choice."}}),
-              takeMessages());
-    EXPECT_EQ(0u, OrvSim::takeStats(SESSION).commands);
-    EXPECT_EQ(0x00D1, word(0, 0));
-
-    // Unknown parameter names, for a get and for a set.
-    EXPECT_EQ((Orv_HashMapCStr{{"LEVEL", ""}, {"NOPE", "x"}}),
-              get(CTRL, {{"LEVEL", ""}, {"NOPE", "x"}}, FAILED));
-    EXPECT_EQ(FAILED, set(CTRL, {{"mode", "On"}}));
-    EXPECT_EQ((std::vector<Said>{{256, "OrvNebu_getParameter() - Unknown parameter name 'NOPE'"},
-                                 {256, "OrvNebu_getParameter() - Unknown parameter name 'mode'"}}),
-              takeMessages());
-    EXPECT_EQ(0u, OrvSim::takeStats(SESSION).commands);
-}
-
-TEST_F(DefaultSlaveParams, Choices) {
-    initialize(CTRL);
-    EXPECT_EQ((std::vector<std::string>{"Off", "On", "Fast", "Same"}),
-              choices(CTRL, {{"MODE", ""}}));
-    EXPECT_EQ((std::vector<std::string>{"Small", "Zero", "Other"}),
-              choices(CTRL, {{"COUNT", "whatever"}}));
-    EXPECT_EQ(0u, OrvSim::takeStats(SESSION).commands);
-    EXPECT_TRUE(takeMessages().empty());
-
-    choices(CTRL, {}, FAILED);
-    choices(CTRL, {{"Mode", ""}}, FAILED);
-    EXPECT_EQ((std::vector<Said>{
-                  {256,
-                   "OrvNebu_getParameterChoices(): 'params' argument has no parameter name passed "
-                   "in."},
-                  {256, "OrvNebu_getParameterChoices(): param 'Mode' is not a valid parameter."}}),
-              takeMessages());
-}
-
+// Reading and setting choices on the board are in the slave_params transcript.
 TEST_F(DefaultSlaveParams, ArgumentChecksComeAfterTheSlave) {
     initialize(CTRL);
     ORV_HASHMAP_HANDLE params = makeMap({{"MODE", ""}});
@@ -358,18 +228,6 @@ TEST_F(DefaultSlaveParams, ArgumentChecksComeAfterTheSlave) {
     EXPECT_EQ(FAILED, OrvNebu_setParameters(SESSION, none, nullptr));
     EXPECT_EQ(FAILED, OrvNebu_getParameterChoices(SESSION, none, nullptr, nullptr));
     EXPECT_EQ((std::vector<Said>{{256, unknown}, {256, unknown}, {256, unknown}}), takeMessages());
-}
-
-TEST_F(DefaultSlaveParams, ASlaveWithoutParameterFileHasNoParameters) {
-    initialize(PLAIN);
-    EXPECT_EQ(Orv_HashMapCStr{}, get(PLAIN, {}));
-    EXPECT_EQ(1u, OrvSim::takeStats(SESSION).roundTrips);
-    get(PLAIN, {{"MODE", ""}}, FAILED);
-    choices(PLAIN, {{"MODE", ""}}, FAILED);
-    EXPECT_EQ((std::vector<Said>{
-                  {256, "OrvNebu_getParameter() - Unknown parameter name 'MODE'"},
-                  {256, "OrvNebu_getParameterChoices(): param 'MODE' is not a valid parameter."}}),
-              takeMessages());
 }
 
 TEST_F(DefaultSlaveParams, SlavesOfASessionShareTheFileActions) {

@@ -41,7 +41,7 @@ protected:
     }
 };
 
-TEST_F(DirectoryReaderTest, HeaderInAnyCaseOrderAndSpacing) {
+TEST_F(DirectoryReaderTest, HeaderKeyColumnsAndLines) {
     Orv_HashMapCStr entry;
     ASSERT_TRUE(
         lookup(" Slave_Type ,ORV_DRV_VER_MIN,orv_drv_ver_max,Registers,parameters\n"
@@ -52,61 +52,44 @@ TEST_F(DirectoryReaderTest, HeaderInAnyCaseOrderAndSpacing) {
                                       {"orv_drv_ver_max", "2"},
                                       {"registers", "R.csv"},
                                       {"parameters", "P.csv"}}));
-    // Key columns anywhere; values are taken as they stand, blanks included.
-    EXPECT_EQ(registersFor("registers,x,orv_drv_ver_max,orv_drv_ver_min,slave_type\n"
-                           " R.csv ,,9,1,17\n",
-                           17, 5),
-              " R.csv ");
-    // The same header column twice: the leftmost value stays.
+    const std::string h = "slave_type,orv_drv_ver_min,orv_drv_ver_max,registers,parameters\n";
+    const struct {
+        std::string text;
+        int32_t type, version;
+        const char* registers;
+    } rows[] = {
+        // Key columns anywhere; values taken as they stand; the leftmost of a twice column.
+        {"registers,x,orv_drv_ver_max,orv_drv_ver_min,slave_type\n R.csv ,,9,1,17\n", 17, 5,
+         " R.csv "},
+        {"registers,slave_type,orv_drv_ver_min,orv_drv_ver_max,registers\nl.csv,1,1,1,r.csv\n", 1,
+         1, "l.csv"},
+        // Every number base; the version range is inclusive at both ends.
+        {h + "0x15,1,0xFFFF,hex.csv,\n", 21, 7, "hex.csv"},
+        {h + "0X15,1,0XFFFF,hex.csv,\n", 21, 7, "hex.csv"},
+        {h + "025,1,1,oct.csv,\n", 21, 1, "oct.csv"},
+        {h + "  +21abc,1,1,lead.csv,\n", 21, 1, "lead.csv"},
+        {h + "none,-5,-1,neg.csv,\n", 0, -3, "neg.csv"},
+        {h + "99999999999,0,1,big.csv,\n", 2147483647, 1, "big.csv"},
+        {h + "1,2,4,r.csv,\n", 1, 2, "r.csv"},
+        {h + "1,2,4,r.csv,\n", 1, 4, "r.csv"},
+        {h + "1,2,4,r.csv,\n", 1, 1, "<none>"},
+        {h + "1,2,4,r.csv,\n", 1, 5, "<none>"},
+        // First match wins, lines too short for the keys are skipped, extra fields ignored.
+        {"a,b,slave_type,orv_drv_ver_min,orv_drv_ver_max,registers\n"
+         "x,y,1,1\nx,y,1,1,1,first.csv,extra\nx,y,1,1,1,second.csv\n",
+         1, 1, "first.csv"},
+        {"slave_type,orv_drv_ver_min,orv_drv_ver_max,parameters,registers\r\n1,1,1,,r.csv\r\n", 1,
+         1, "r.csv"},
+        // Ctrl-Z, the end of a text file to old Windows programs, is a character like any other.
+        {h + "2,1,1,\x1a.csv,\n1,1,1,after.csv,\n", 1, 1, "after.csv"},
+    };
+    for (const auto& row : rows) {
+        EXPECT_EQ(registersFor(row.text, row.type, row.version), row.registers) << row.text;
+    }
+    // A line shorter than the header delivers what it has.
     entry.clear();
-    ASSERT_TRUE(
-        lookup("registers,slave_type,orv_drv_ver_min,orv_drv_ver_max,registers\n"
-               "left.csv,1,1,1,right.csv\n",
-               1, 1, entry));
-    EXPECT_EQ(entry["registers"], "left.csv");
-}
-
-TEST_F(DirectoryReaderTest, KeyColumnsInEveryNumberBase) {
-    const std::string header = "slave_type,orv_drv_ver_min,orv_drv_ver_max,registers,parameters\n";
-    EXPECT_EQ(registersFor(header + "0x15,1,0xFFFF,hex.csv,\n", 21, 7), "hex.csv");
-    EXPECT_EQ(registersFor(header + "0X15,1,0XFFFF,hex.csv,\n", 21, 7), "hex.csv");
-    EXPECT_EQ(registersFor(header + "025,1,1,oct.csv,\n", 21, 1), "oct.csv");
-    EXPECT_EQ(registersFor(header + "21,1,1,dec.csv,\n", 21, 1), "dec.csv");
-    EXPECT_EQ(registersFor(header + "  +21abc,1,1,lead.csv,\n", 21, 1), "lead.csv");
-    EXPECT_EQ(registersFor(header + "none,-5,-1,neg.csv,\n", 0, -3), "neg.csv");
-    EXPECT_EQ(registersFor(header + "99999999999,0,1,big.csv,\n", 2147483647, 1), "big.csv");
-    // The version range is inclusive at both ends.
-    EXPECT_EQ(registersFor(header + "1,2,4,r.csv,\n", 1, 2), "r.csv");
-    EXPECT_EQ(registersFor(header + "1,2,4,r.csv,\n", 1, 4), "r.csv");
-    EXPECT_EQ(registersFor(header + "1,2,4,r.csv,\n", 1, 1), "<none>");
-    EXPECT_EQ(registersFor(header + "1,2,4,r.csv,\n", 1, 5), "<none>");
-}
-
-TEST_F(DirectoryReaderTest, LinesFirstMatchWinsShortLinesSkippedLongLinesCut) {
-    EXPECT_EQ(registersFor("a,b,slave_type,orv_drv_ver_min,orv_drv_ver_max,registers\n"
-                           "x,y,1,1\n"                    // too short for the key columns
-                           "x,y,1,1,1,first.csv,extra\n"  // extra fields ignored
-                           "x,y,1,1,1,second.csv\n",
-                           1, 1),
-              "first.csv");
-    Orv_HashMapCStr entry;
-    ASSERT_TRUE(
-        lookup("slave_type,orv_drv_ver_min,orv_drv_ver_max,registers,parameters\n"
-               "1,1,1\n",
-               1, 1, entry));
-    EXPECT_EQ(entry.size(), 3u);  // a line shorter than the header delivers what it has
-    EXPECT_EQ(entry.count("registers"), 0u);
-    // CR LF line ends read like LF.
-    EXPECT_EQ(registersFor("slave_type,orv_drv_ver_min,orv_drv_ver_max,parameters,registers\r\n"
-                           "1,1,1,,r.csv\r\n",
-                           1, 1),
-              "r.csv");
-    // Ctrl-Z, the end of a text file to old Windows programs, is a character like any other.
-    EXPECT_EQ(registersFor("slave_type,orv_drv_ver_min,orv_drv_ver_max,registers,parameters\n"
-                           "2,1,1,\x1a.csv,\n"
-                           "1,1,1,after.csv,\n",
-                           1, 1),
-              "after.csv");
+    ASSERT_TRUE(lookup(h + "1,1,1\n", 1, 1, entry));
+    EXPECT_EQ(entry.size(), 3u);
     EXPECT_NO_MESSAGES();
 }
 

@@ -31,54 +31,30 @@ protected:
     }
 };
 
-TEST_F(SlaveChainTest, NextAndPreviousAlongTheBoardsLinks) {
+// The demo chain of duals is in the transceiver_slaves transcript; here the links it lacks.
+TEST_F(SlaveChainTest, LinksThatLeadNowhereOrBack) {
     ASSERT_EQ(initialize(3), ORVNEBU_OK);  // next_slave 2
     ASSERT_EQ(initialize(5), ORVNEBU_OK);
-    OrvNebu_Slave* three = slaveAt(3);
-    OrvNebu_Slave* five = slaveAt(5);
-    ASSERT_NE(three, nullptr);
-    ASSERT_NE(five, nullptr);
-
-    EXPECT_EQ(three->getNextSlave(), five);
-    EXPECT_EQ(five->getNextSlave(), nullptr);
-    EXPECT_EQ(five->getPreviousSlave(), three);
-    EXPECT_EQ(three->getPreviousSlave(), nullptr);
-
-    // A link to a position with no slave object gives null.
     ASSERT_EQ(terminate(5), ORVNEBU_OK);
-    EXPECT_EQ(three->getNextSlave(), nullptr);
-}
+    EXPECT_EQ(slaveAt(3)->getNextSlave(), nullptr) << "no slave object at the link";
+    ASSERT_EQ(terminate(3), ORVNEBU_OK);
 
-TEST_F(SlaveChainTest, LinksThatAreNoNumberOrZeroLeadNowhere) {
-    const char* texts[] = {nullptr, "", "0", "abc", " 0x2"};
-    uint32_t index = 0;
-    for (const char* text : texts) {
+    uint32_t index = 10;
+    for (const char* text : {(const char*)nullptr, "", "0", "abc", " 0x2"}) {
         OrvNebu_Slave* s = addSlave(index, text);
-        ASSERT_NE(s, nullptr);
         addSlave(index + 2, nullptr);
         EXPECT_EQ(s->getNextSlave(), nullptr) << (text ? text : "(absent)");
         ++index;
     }
-}
-
-TEST_F(SlaveChainTest, LoopingLinksLeadBackAndHaveNoStart) {
     OrvNebu_Slave* a = addSlave(3, "2");
     OrvNebu_Slave* b = addSlave(5, "-2");
     OrvNebu_Slave* c = addSlave(6, " +0");
-    ASSERT_TRUE(a && b && c);
     EXPECT_EQ(a->getNextSlave(), b);
     EXPECT_EQ(b->getNextSlave(), a);
     EXPECT_EQ(a->getPreviousSlave(), b);
     EXPECT_EQ(b->getPreviousSlave(), a);
     EXPECT_EQ(c->getPreviousSlave(), nullptr);
-}
-
-TEST_F(SlaveChainTest, ParameterFromNoOtherSlaveIsTheDefault) {
-    OrvNebu_Slave* a = addSlave(0, nullptr);
-    ASSERT_NE(a, nullptr);
     EXPECT_EQ(a->getParamFromOtherSlave(nullptr, "refclk", "GREFCLK"), "GREFCLK");
-
-    EXPECT_EQ(dynamic_cast<OrvNebu_DefaultSlave*>(a)->getParamAction("anything"), nullptr);
 }
 
 }  // namespace

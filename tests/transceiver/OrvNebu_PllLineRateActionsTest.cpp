@@ -68,23 +68,6 @@ struct M3QrcChannel : ::testing::Test {
 
 }  // namespace
 
-TEST_F(M3QrcChannel, NamesSubActionsAndRegistersOfTheChannel) {
-    EXPECT_TRUE(action->isChoiceParam());
-    EXPECT_EQ(5001u, action->getPriority());
-    EXPECT_EQ((std::vector<std::string>{"line_rate0", "refclk_freq0"}), *action->getParamNames());
-    Orv_HashMapCStr registers;
-    action->getRegsToRead(registers);
-    // FB, REF, transmit output divider and data width; not the receive divider.
-    EXPECT_EQ((Orv_HashMapCStr{{"FB0", ""}, {"REF0", ""}, {"TXOUT0", ""}, {"WIDTH0", ""}}),
-              registers);
-
-    addM3QrcDividers(slave, "1");
-    OrvNebu_M3Qrc_LineRateParamAction channel7(&slave, 7, 5002);
-    EXPECT_EQ("line_rate1", channel7.getParamName()) << "any non-zero index is channel 1";
-    OrvNebu_R3Qrb_LineRateParamAction quad(&slave, 1, 5002);
-    EXPECT_EQ("refclk_freq1", quad.getParamNames()->at(1));
-}
-
 TEST_F(M3QrcChannel, NineChoicesInDividerOrderAndTheMaximumLineRate) {
     const std::vector<std::string> nine{
         "2500.000 FB=2, REF=1, DIVSEL=1", "1250.000 FB=2, REF=1, DIVSEL=2",
@@ -116,35 +99,15 @@ TEST_F(M3QrcChannel, VcoBoundsAreInclusiveAndDataWidthSetsTheFactor) {
     EXPECT_EQ("3072.000 FB=5, REF=2, DIVSEL=1", list[6]);
 }
 
-TEST_F(M3QrcChannel, ChoicesNeedTheReferenceClockAndReadTheSlave) {
-    Orv_HashMapCStr params{{"line_rate0", ""}};
-    std::vector<std::string> list{"kept"};
-    EXPECT_EQ(
-        "Cannot calculate line rate choices, since refclk_freq0 has not been passed in to "
-        "getParamChoices() function.",
-        message([&] { action->getChoices(&params, list); }));
-    EXPECT_EQ(1u, list.size());
-
-    slave.readLog.clear();
-    slave.parameterCalls = 0;
-    choices("125");
-    EXPECT_EQ(1, slave.parameterCalls) << "the data width is read as a parameter";
-    EXPECT_NE(std::find(slave.readLog.begin(), slave.readLog.end(), "MAX_LINERATE"),
-              slave.readLog.end());
-}
-
 TEST_F(M3QrcChannel, CurrentRateWithItsDividers) {
     slave.memory["FB0"] = "2";
     slave.memory["REF0"] = "1";
     slave.memory["TXOUT0"] = "2";
-    EXPECT_EQ("1250.000 FB=2, REF=1, DIVSEL=2", current({{"refclk_freq0", "125"}}));
-
+    slave.memory["RXOUT0"] = "4";   // the receive divider does not count
     slave.memory["WIDTH0"] = "20";  // 32 bits: factor 4
     EXPECT_EQ("1000.000 FB=2, REF=1, DIVSEL=2", current({{"refclk_freq0", "125"}}));
-
     slave.memory["REF0"] = "7";  // no choice: REF reads 0
     EXPECT_EQ("0.000 FB=2, REF=0, DIVSEL=2", current({{"refclk_freq0", "125"}}));
-
     EXPECT_EQ(
         "Cannot calculate line rate choice, since refclk_freq0 has not been passed in to "
         "getParam() function.",
@@ -154,33 +117,27 @@ TEST_F(M3QrcChannel, CurrentRateWithItsDividers) {
     Orv_HashMapCStr registers, all;
     action->readRegsAndUpdateParams(true, registers, all);
     EXPECT_TRUE(all.empty());
+    addM3QrcDividers(slave, "1");
+    OrvNebu_M3Qrc_LineRateParamAction channel7(&slave, 7, 5002);
+    EXPECT_EQ("line_rate1", channel7.getParamName()) << "any non-zero index is channel 1";
 }
 
 TEST_F(M3QrcChannel, SettingWritesWindowsAndBothOutputDividers) {
-    Orv_HashMapCStr params{{"line_rate0", "2500.000 FB=2, REF=1, DIVSEL=1"}, {"sysclk_freq", "50"}};
-    slave.memory["RXOUT0"] = "4";
-    slave.setParameters(1, slave.getSlaveRef(), &params);
-    // 50 * 224000 / 250 = 44800; 50 * 224000 / 125 = 89600, held at 65535.
-    EXPECT_EQ("AF00", slave.memory["TXUSRCLK_FREQ_TUNE0"]);
-    EXPECT_EQ("AF00", slave.memory["RXUSRCLK_FREQ_TUNE0"]);
-    EXPECT_EQ("AF00", slave.memory["TXOUTCLK_FREQ_TUNE0"]);
-    EXPECT_EQ("AF00", slave.memory["RXRECCLK_FREQ_TUNE0"]);
-    EXPECT_EQ("FFFF", slave.memory["TXUSRCLK2_FREQ_TUNE0"]);
-    EXPECT_EQ("FFFF", slave.memory["RXUSRCLK2_FREQ_TUNE0"]);
-    EXPECT_EQ("2", slave.memory["FB0"]);
-    EXPECT_EQ("1", slave.memory["REF0"]);
-    EXPECT_EQ("1", slave.memory["TXOUT0"]);
-    EXPECT_EQ("1", slave.memory["RXOUT0"]);
-    EXPECT_EQ("14", slave.memory["WIDTH0"]) << "the data width is not set";
-
     // Data width 16 (not a multiple of 10): the flagged clocks run at rate / 8.
     slave.memory["WIDTH0"] = "10";
-    Orv_HashMapCStr again{{"line_rate0", "1250.000 FB=2, REF=1, DIVSEL=2 and more"},
-                          {"sysclk_freq", "10"}};
-    slave.setParameters(1, slave.getSlaveRef(), &again);
-    EXPECT_EQ("3816", slave.memory["TXUSRCLK_FREQ_TUNE0"]);   // 10 * 224000 / 156
+    slave.memory["RXOUT0"] = "4";
+    Orv_HashMapCStr params{{"line_rate0", "1250.000 FB=2, REF=1, DIVSEL=2 and more"},
+                           {"sysclk_freq", "10"}};
+    slave.setParameters(1, slave.getSlaveRef(), &params);
+    EXPECT_EQ("3816", slave.memory["TXUSRCLK_FREQ_TUNE0"]);  // 10 * 224000 / 156
+    EXPECT_EQ("3816", slave.memory["RXRECCLK_FREQ_TUNE0"]);
+    EXPECT_EQ("3816", slave.memory["RXUSRCLK_FREQ_TUNE0"]);
+    EXPECT_EQ("3816", slave.memory["TXOUTCLK_FREQ_TUNE0"]);
     EXPECT_EQ("702D", slave.memory["TXUSRCLK2_FREQ_TUNE0"]);  // 10 * 224000 / 78
+    EXPECT_EQ("702D", slave.memory["RXUSRCLK2_FREQ_TUNE0"]);
     EXPECT_EQ("2", slave.memory["TXOUT0"]);
+    EXPECT_EQ("2", slave.memory["RXOUT0"]);
+    EXPECT_EQ("10", slave.memory["WIDTH0"]) << "the data width is not set";
 }
 
 TEST_F(M3QrcChannel, UnreadableNegativeOrEndlessRatesAreRefusedAndWriteNothing) {
@@ -242,7 +199,11 @@ TEST(PllLineRateChoiceString, FormatAndReading) {
     EXPECT_TRUE(OrvNebu_PllLineRateParamAction::readLineRateChoiceString(fb, ref, divsel, rate,
                                                                          "10,a=3 b=4 c=5"));
     EXPECT_EQ(5u, divsel);
-    for (const char* bad : {"foo", "100 FB=1, REF=2, DIVSEL=", "100 FB=x, REF=2, DIVSEL=3", ""}) {
+    EXPECT_TRUE(OrvNebu_PllLineRateParamAction::readLineRateChoiceString(
+        fb, ref, divsel, rate, "9.5e+2 FB=1, REF=1, DIVSEL=1"));
+    EXPECT_EQ(950.0, rate);
+    for (const char* bad : {"foo", "100 FB=1, REF=2, DIVSEL=", "100 FB=x, REF=2, DIVSEL=3", "",
+                            "FB=1, REF=2, DIVSEL=3", ".e1 FB=1, REF=2, DIVSEL=3"}) {
         EXPECT_FALSE(
             OrvNebu_PllLineRateParamAction::readLineRateChoiceString(fb, ref, divsel, rate, bad));
         EXPECT_EQ(0u, fb + ref + divsel) << bad;
@@ -305,6 +266,10 @@ TEST_F(R3QraDual, ChoicesWithAndWithoutOversampling) {
                   "480.000 FB=2, REF=1, DIVSEL=1", "1200.000 FB=2, REF=1, DIVSEL=2",
                   "240.000 FB=2, REF=1, DIVSEL=2", "480.000 FB=4, REF=1, DIVSEL=2"}),
               choices("120"));
+    // 481.0 itself is listed.
+    slave.memory["MAX_LINERATE"] = "0";
+    EXPECT_EQ("481.000 FB=2, REF=1, DIVSEL=1", choices("120.25").at(1));
+    slave.memory["MAX_LINERATE"] = "77359400";
     // 2500.0 is over the maximum and its fifth, 500.0, over 481.0.
     std::vector<std::string> list = choices("125");
     EXPECT_EQ("1250.000 FB=2, REF=1, DIVSEL=2", list.at(0));

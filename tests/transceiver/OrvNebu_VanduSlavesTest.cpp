@@ -26,17 +26,14 @@ namespace {
 template <class V>
 class Registered : public V {
 public:
-    explicit Registered(std::initializer_list<const char*> choiceNames)
+    explicit Registered(const std::set<std::string>& choiceNames)
         : V(1, ORV_SLAVE_REF{0, 2, 3}, ORV_CORE_INFO{{1, 0x44, 0, 0, 0}}, Orv_HashMapCStr{}) {
-        for (const char* name : choiceNames) {
-            choices_.push_back(std::make_unique<xcvrtest::ChoiceAction>(name, name, 10002));
+        for (const std::string& name : choiceNames) {
+            choices_.push_back(std::make_unique<OrvRT::OrvNebu_ParamChoiceAction>(name, 10002));
             OrvNebu_ParamAction::addActionToHashMap(this->actions_, choices_.back().get());
         }
     }
     void registerActions() { this->addToActionsHashMap(1, this->actions_); }
-    void addAction(OrvNebu_ParamAction* action) {
-        OrvNebu_ParamAction::addActionToHashMap(this->actions_, action);
-    }
     // The priority of the action under name, or 0 when there is none.
     uint32_t priorityOf(const std::string& name) {
         OrvNebu_ParamAction* action = this->getParamAction(name);
@@ -53,16 +50,8 @@ public:
     }
 
 private:
-    std::vector<std::unique_ptr<xcvrtest::ChoiceAction>> choices_;
+    std::vector<std::unique_ptr<OrvRT::OrvNebu_ParamChoiceAction>> choices_;
 };
-
-const std::initializer_list<const char*> M3QRC_CHOICES{
-    "pll_divsel_fb_0", "pll_divsel_ref_0", "pll_txdivsel_out_0", "tx_data_width0",
-    "pll_divsel_fb_1", "pll_divsel_ref_1", "pll_txdivsel_out_1", "tx_data_width1"};
-
-}  // namespace
-
-namespace {
 
 // Registers class V's actions with the choice parameters the table names, and checks each
 // computed action of the table against the one registered: its priority, the names it
@@ -75,18 +64,14 @@ void expectAsTheTableSays(OrvRT::OrvNebu_SlaveClassTable::SlaveClass slaveClass)
     for (const auto& action : info.actions) {
         choices.insert(action.choiceParameters.begin(), action.choiceParameters.end());
     }
-    std::vector<std::unique_ptr<xcvrtest::ChoiceAction>> owned;
-    Registered<V> slave({});
-    for (const std::string& name : choices) {
-        owned.push_back(std::make_unique<xcvrtest::ChoiceAction>(name, name, 10002));
-        slave.addAction(owned.back().get());
-    }
+    Registered<V> slave(choices);
     slave.registerActions();
     EXPECT_EQ(choices.size() + info.actions.size(), slave.distinctActions());
     for (size_t i = 0; i < info.actions.size(); ++i) {
         const auto& described = info.actions[i];
         OrvNebu_ParamAction* action = slave.getParamAction(described.parameters.front());
         ASSERT_NE(action, nullptr) << described.className;
+        EXPECT_EQ(described.parameters.front(), action->getParamName());
         EXPECT_EQ(OrvRT::OrvNebu_SlaveClassTable::START_PRIORITY + i, action->getPriority());
         EXPECT_EQ(std::set<std::string>(described.parameters.begin(), described.parameters.end()),
                   std::set<std::string>(action->getParamNames()->begin(),

@@ -15,6 +15,7 @@
 #include <vector>
 
 #include "host/OrvCore.h"
+#include "params/OrvNebu_ParamChoiceAction.h"
 #include "slave/OrvNebu_DefaultSlave.h"
 
 namespace xcvrtest {
@@ -23,65 +24,19 @@ using OrvRT::Orv_HashMapCStr;
 using OrvRT::OrvNebu_ActionsMap;
 using OrvRT::OrvNebu_ParamAction;
 
-// A choice parameter whose choices each set one register to one value (a hexadecimal text).
-class ChoiceAction : public OrvNebu_ParamAction {
-public:
-    ChoiceAction(const std::string& name, const std::string& reg, uint32_t priority)
-        : names_{name}, reg_(reg), priority_(priority) {}
-    ChoiceAction& choice(const std::string& choiceName, const std::string& value) {
-        choices_.emplace_back(choiceName, value);
-        return *this;
-    }
-    // Choices whose name is the register's value in decimal.
-    ChoiceAction& numbers(std::initializer_list<unsigned> values) {
+// A choice parameter whose choices each set one register to their number.
+struct Choices {
+    OrvRT::OrvNebu_ParamChoiceAction& action;
+    std::string reg;
+    void numbers(std::initializer_list<unsigned> values) {
+        uint32_t index = 0;
         for (unsigned v : values) {
             char hex[16];
             std::snprintf(hex, sizeof hex, "%X", v);
-            choice(std::to_string(v), hex);
-        }
-        return *this;
-    }
-
-    bool isChoiceParam() override { return true; }
-    const std::string& getParamName() override { return names_.front(); }
-    const std::vector<std::string>* getParamNames() override { return &names_; }
-    uint32_t getPriority() override { return priority_; }
-    void getRegsToRead(Orv_HashMapCStr& registers) override { registers[reg_] = ""; }
-    void readRegsAndUpdateParams(bool, Orv_HashMapCStr& registers,
-                                 Orv_HashMapCStr& params) override {
-        std::string& value = params[names_.front()];
-        value.clear();
-        const std::string& current = registers[reg_];
-        for (const auto& c : choices_) {
-            if (std::strtoull(c.second.c_str(), nullptr, 16) ==
-                std::strtoull(current.c_str(), nullptr, 16)) {
-                value = c.first;
-                return;
-            }
+            action.addChoice(std::to_string(v), index);
+            action.addChoiceRegSetting(index++, 32, reg, hex);
         }
     }
-    void setParams(Orv_HashMapCStr& params, Orv_HashMapCStr& registers) override {
-        const std::string& value = params[names_.front()];
-        if (value.empty()) return;
-        for (const auto& c : choices_) {
-            if (c.first == value) {
-                registers[reg_] = c.second;
-                return;
-            }
-        }
-        throw std::logic_error("Setting Parameter '" + names_.front() + "' to value '" + value +
-                               "' is not a valid choice.");
-    }
-    void getChoices(Orv_HashMapCStr*, std::vector<std::string>& choices) override {
-        choices.clear();
-        for (const auto& c : choices_) choices.push_back(c.first);
-    }
-
-private:
-    std::vector<std::string> names_;
-    std::string reg_;
-    uint32_t priority_;
-    std::vector<std::pair<std::string, std::string>> choices_;
 };
 
 // A slave with registers in memory and a small parameter engine over its actions: requested
@@ -95,17 +50,15 @@ public:
 
     // Memory registers; reads of unknown names fail like an unknown register would.
     std::map<std::string, std::string> memory;
-    // Every register name read and written, in order.
-    std::vector<std::string> readLog, writeLog;
-    int parameterCalls = 0;
+    // Every register name written, in order.
+    std::vector<std::string> writeLog;
 
-    ChoiceAction& addChoice(const std::string& name, const std::string& reg) {
-        owned_.push_back(std::make_unique<ChoiceAction>(
-            name, reg, 10000u + static_cast<uint32_t>(owned_.size())));
-        ChoiceAction* action = owned_.back().get();
-        OrvNebu_ParamAction::addActionToHashMap(actions_, action);
+    Choices addChoice(const std::string& name, const std::string& reg) {
+        owned_.push_back(std::make_unique<OrvRT::OrvNebu_ParamChoiceAction>(
+            name, 10000u + static_cast<uint32_t>(owned_.size())));
+        OrvNebu_ParamAction::addActionToHashMap(actions_, owned_.back().get());
         memory.emplace(reg, "0");
-        return *action;
+        return Choices{*owned_.back(), reg};
     }
     // Constructs a computed action on this slave (slave pointer first) and enters it.
     template <class Action, class... Args>
@@ -123,7 +76,6 @@ public:
             auto it = memory.find(entry.first);
             if (it == memory.end()) throw std::logic_error("no register " + entry.first);
             entry.second = it->second;
-            readLog.push_back(entry.first);
         }
     }
     void setRegisters(uint32_t, const ORV_SLAVE_REF&, Orv_HashMapCStr* registers) override {
@@ -134,7 +86,6 @@ public:
     }
     void getParameters(uint32_t handle, const ORV_SLAVE_REF& ref,
                        Orv_HashMapCStr* params) override {
-        ++parameterCalls;
         std::vector<OrvNebu_ParamAction*> list = requested(*params);
         Orv_HashMapCStr registers;
         for (auto* a : list) a->getRegsToRead(registers);
@@ -180,7 +131,7 @@ private:
         return list;
     }
 
-    std::vector<std::unique_ptr<ChoiceAction>> owned_;
+    std::vector<std::unique_ptr<OrvRT::OrvNebu_ParamChoiceAction>> owned_;
 };
 
 }  // namespace xcvrtest
