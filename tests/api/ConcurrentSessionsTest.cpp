@@ -17,13 +17,11 @@ namespace {
 class ConcurrentSessions : public TestHost {};
 
 // Each session drives a device of its own (one JTAG target each), as a host would.
-const char* const BOARD = R"({ "devices": [
-    { "chains": { "1": { "cores": [ { "type": 14, "master": { "slaveCount": 8, "slaves": {
-        "0": { "slaveType": "0x11", "driverVersion": 1 } } } } ] } } },
-    { "chains": { "1": { "cores": [ { "type": 14, "master": { "slaveCount": 8, "slaves": {
-        "0": { "slaveType": "0x11", "driverVersion": 1 } } } } ] } } },
-    { "chains": { "1": { "cores": [ { "type": 14, "master": { "slaveCount": 8, "slaves": {
-        "0": { "slaveType": "0x11", "driverVersion": 1 } } } } ] } } } ] })";
+std::string threeDevices() {
+    const std::string device = R"({ "chains": { "1": { "cores": [ { "type": 14, "master": {
+        "slaveCount": 8, "slaves": { "0": { "slaveType": "0x11", "driverVersion": 1 } } } } ] } } })";
+    return R"({ "devices": [ )" + device + ", " + device + ", " + device + " ] }";
+}
 
 // One session's work, repeated: everything that creates or drops shared state (the bus
 // list, the register handler cache, the parameter file cache).
@@ -48,7 +46,7 @@ uint32_t sessionWork(uint32_t handle, uint32_t device, uint32_t rounds) {
 }
 
 TEST_F(ConcurrentSessions, ThreeSessionsDiscoverInitializeReadAndEndAtOnce) {
-    loadBoard(BOARD);
+    loadBoard(threeDevices());
     constexpr uint32_t ROUNDS = 120;
     std::atomic<uint32_t> failures(0);
     std::vector<std::thread> threads;

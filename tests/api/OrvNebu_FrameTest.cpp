@@ -4,6 +4,7 @@
 
 #include <functional>
 #include <future>
+#include <iterator>
 #include <stdexcept>
 #include <string>
 #include <vector>
@@ -23,26 +24,20 @@ using OrvRT::unlockedFrame;
 class FrameTest : public BusFixture {};
 
 TEST_F(FrameTest, ExceptionsBecomeOneMessageWithTheirSeverity) {
-    struct Case {
-        const char* name;
+    const struct {
         std::function<void()> body;
         uint32_t severity;
         std::string text;
+    } cases[] = {
+        {[] { throw OrvRT::Orv_AbortException(); }, 32768, "Orv abort command"},
+        {[] { throw std::logic_error("Orv abort command"); }, 32768, "Orv abort command"},
+        {[] { throw std::logic_error("Orv abort command."); }, 256, "Orv abort command."},
+        {[] { throw std::runtime_error("Orv abort"); }, 256, "Orv abort"},
+        {[] { throw std::out_of_range("bad index"); }, 256, "bad index"},
+        {[] { throw 42; }, 256, "Orv internal error."},
     };
-    const Case cases[] = {
-        {"abort", [] { throw OrvRT::Orv_AbortException(); }, 32768, "Orv abort command"},
-        {"abort text in a plain logic error", [] { throw std::logic_error("Orv abort command"); },
-         32768, "Orv abort command"},
-        {"longer text", [] { throw std::logic_error("Orv abort command."); }, 256,
-         "Orv abort command."},
-        {"shorter text", [] { throw std::runtime_error("Orv abort"); }, 256, "Orv abort"},
-        {"other standard exception", [] { throw std::out_of_range("bad index"); }, 256,
-         "bad index"},
-        {"not a standard exception", [] { throw 42; }, 256, "Orv internal error."},
-        {"a string", [] { throw std::string("text"); }, 256, "Orv internal error."},
-    };
-    for (const Case& c : cases) {
-        SCOPED_TRACE(c.name);
+    for (const auto& c : cases) {
+        SCOPED_TRACE(c.text);
         for (uint32_t h : {3u, 4u}) {
             clearLog();
             EXPECT_EQ(h == 3 ? lockedFrame(h, c.body) : unlockedFrame(h, c.body), FAILED);
@@ -100,48 +95,41 @@ TEST_F(FrameTest, EveryCallButTerminateHoldsTheTargetWithTheSpecifiedTimeout) {
     uint32_t n = 0;
     char text[9] = "00000000";
     ASSERT_EQ(OrvNebu_initialize(H, s), 0u) << joined();
-    struct Call {
-        const char* name;
-        std::function<uint32_t()> run;
+    const std::function<uint32_t()> calls[] = {
+        [&] { return OrvNebu_initialize(H, s); },
+        [&] { return OrvNebu_getBusInfo(H, 0, 1, &(map = makeMap())); },
+        [&] { return OrvNebu_getSlaveCount(H, 0, 1, &n); },
+        [&] { return OrvNebu_getSlaveHandles(H, 0, 1, w, 2); },
+        [&] { return OrvNebu_getSlaveInfo(H, s, &(map = makeMap())); },
+        [&] { return OrvNebu_getRegisters(H, s, &(map = makeMap())); },
+        [&] { return OrvNebu_setRegisters(H, s, &regs); },
+        [&] { return OrvNebu_getParameters(H, s, &(map = makeMap())); },
+        [&] { return OrvNebu_setParameters(H, s, &mode); },
+        [&] { return OrvNebu_getParameterChoices(H, s, &mode, &choices); },
+        [&] { return OrvNebu_read(H, s, 0, 2, text); },
+        [&] { return OrvNebu_write(H, s, 0x20, 2, text); },
+        [&] { return OrvNebu_getBusErrorStatus(H, 0, 1, w, 2); },
+        [&] { return OrvNebu_clearBusErrorStatus(H, 0, 1); },
+        [&] { return OrvNebu_resetBus(H, 0, 1); },
+        [&] { return OrvNebu_testSlaveInterface(H, s, &n); },
+        [&] { return OrvNebu_resetSlave(H, s); },
+        [&] { return OrvNebu_disableSlave(H, s); },
+        [&] { return OrvNebu_enableSlave(H, s); },
+        [&] { return OrvNebu_singleSlaveRead(H, s, 0, w, &n); },
+        [&] { return OrvNebu_singleSlaveWrite(H, s, 0x20, 1, &n); },
+        [&] { return OrvNebu_singleSlaveReadModifyWrite(H, s, 0x20, 1, 0xFF00, &n); },
+        [&] { return OrvNebu_singleSlaveWriteAndInspect(H, s, 0x20, 1, w, &n); },
+        [&] { return OrvNebu_burstSlaveRead(H, s, 0, 1, w, 2, &n); },
+        [&] { return OrvNebu_burstSlaveWrite(H, s, 0x20, 1, w, 2, &n); },
+        [&] { return OrvNebu_broadcastSingleWrite(H, 0, 1, 0x20, 1, &n); },
+        [&] { return OrvNebu_terminate(H, s); },
     };
-    const Call calls[] = {
-        {"initialize", [&] { return OrvNebu_initialize(H, s); }},
-        {"getBusInfo", [&] { return OrvNebu_getBusInfo(H, 0, 1, &(map = makeMap())); }},
-        {"getSlaveCount", [&] { return OrvNebu_getSlaveCount(H, 0, 1, &n); }},
-        {"getSlaveHandles", [&] { return OrvNebu_getSlaveHandles(H, 0, 1, w, 2); }},
-        {"getSlaveInfo", [&] { return OrvNebu_getSlaveInfo(H, s, &(map = makeMap())); }},
-        {"getRegisters", [&] { return OrvNebu_getRegisters(H, s, &(map = makeMap())); }},
-        {"setRegisters", [&] { return OrvNebu_setRegisters(H, s, &regs); }},
-        {"getParameters", [&] { return OrvNebu_getParameters(H, s, &(map = makeMap())); }},
-        {"setParameters", [&] { return OrvNebu_setParameters(H, s, &mode); }},
-        {"getParameterChoices", [&] { return OrvNebu_getParameterChoices(H, s, &mode, &choices); }},
-        {"read", [&] { return OrvNebu_read(H, s, 0, 2, text); }},
-        {"write", [&] { return OrvNebu_write(H, s, 0x20, 2, text); }},
-        {"getBusErrorStatus", [&] { return OrvNebu_getBusErrorStatus(H, 0, 1, w, 2); }},
-        {"clearBusErrorStatus", [&] { return OrvNebu_clearBusErrorStatus(H, 0, 1); }},
-        {"resetBus", [&] { return OrvNebu_resetBus(H, 0, 1); }},
-        {"testSlaveInterface", [&] { return OrvNebu_testSlaveInterface(H, s, &n); }},
-        {"resetSlave", [&] { return OrvNebu_resetSlave(H, s); }},
-        {"disableSlave", [&] { return OrvNebu_disableSlave(H, s); }},
-        {"enableSlave", [&] { return OrvNebu_enableSlave(H, s); }},
-        {"singleSlaveRead", [&] { return OrvNebu_singleSlaveRead(H, s, 0, w, &n); }},
-        {"singleSlaveWrite", [&] { return OrvNebu_singleSlaveWrite(H, s, 0x20, 1, &n); }},
-        {"singleSlaveReadModifyWrite",
-         [&] { return OrvNebu_singleSlaveReadModifyWrite(H, s, 0x20, 1, 0xFF00, &n); }},
-        {"singleSlaveWriteAndInspect",
-         [&] { return OrvNebu_singleSlaveWriteAndInspect(H, s, 0x20, 1, w, &n); }},
-        {"burstSlaveRead", [&] { return OrvNebu_burstSlaveRead(H, s, 0, 1, w, 2, &n); }},
-        {"burstSlaveWrite", [&] { return OrvNebu_burstSlaveWrite(H, s, 0x20, 1, w, 2, &n); }},
-        {"broadcastSingleWrite",
-         [&] { return OrvNebu_broadcastSingleWrite(H, 0, 1, 0x20, 1, &n); }},
-        {"terminate", [&] { return OrvNebu_terminate(H, s); }},
-    };
-    for (const Call& call : calls) {
-        SCOPED_TRACE(call.name);
+    for (size_t i = 0; i < std::size(calls); ++i) {
+        SCOPED_TRACE(i);
         OrvSim::takeTargetLockUse(H);
-        EXPECT_EQ(call.run(), 0u) << joined();
+        EXPECT_EQ(calls[i](), 0u) << joined();
         const OrvSim::TargetLockUse use = OrvSim::takeTargetLockUse(H);
-        if (std::string(call.name) == "terminate") {
+        if (i + 1 == std::size(calls)) {  // terminate
             EXPECT_TRUE(use.takesByTimeout.empty());
             EXPECT_GT(use.callsUnheld, 0u) << "the host saw it work without the lock";
             continue;

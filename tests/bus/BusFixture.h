@@ -1,5 +1,4 @@
-// Test fixture for the bus: the stand-in host with tracing on, an empty bus list, and
-// helpers that build the expected trace lines of the master's commands.
+// Test fixture for the bus: the stand-in host with tracing on and an empty bus list.
 #pragma once
 
 #include <gtest/gtest.h>
@@ -19,19 +18,8 @@ protected:
 
     void SetUp() override {
         TestHost::SetUp();
-        forgetBuses();
-        enableTrace();
-    }
-
-    // The bus list outlives every host; drop what an earlier test may have left in it.
-    static void forgetBuses() {
+        // The bus list outlives every host; drop what an earlier test may have left in it.
         for (uint32_t h = 0; h < 256; ++h) OrvRT::OrvNebu_BusList::getBusList()->sessionEnded(h);
-    }
-
-    // A host that no longer knows any session or listener, with the same board.
-    void freshHost(const std::string& json) {
-        TestHost::SetUp();
-        loadBoard(json);
         enableTrace();
     }
 
@@ -42,7 +30,6 @@ protected:
 
     std::vector<std::string> jtag() const { return traceStartingWith("jtag "); }
 
-    // Expects exactly one message, with this severity and text.
     void expectOnlyMessage(uint32_t severity, const std::string& text) {
         const auto all = messages();
         ASSERT_EQ(all.size(), 1u) << joined();
@@ -58,23 +45,5 @@ protected:
         return all;
     }
 };
-
-// "0x" and ceil(bits/4) upper-case hexadecimal digits of value.
-inline std::string hexBits(uint64_t value, uint32_t bits) {
-    static const char digits[] = "0123456789ABCDEF";
-    std::string text;
-    for (uint32_t d = (bits + 3) / 4; d-- > 0;) text += digits[(value >> (4 * d)) & 0xF];
-    return "0x" + text;
-}
-
-inline std::string jtagWrite(uint32_t cmd, uint32_t bits, uint64_t value) {
-    return "jtag write cmd=" + std::to_string(cmd) + " bits=" + std::to_string(bits) +
-           " data=" + hexBits(value, bits);
-}
-
-inline std::string jtagRead(uint32_t cmd, uint32_t bits, uint64_t value) {
-    return "jtag read cmd=" + std::to_string(cmd) + " bits=" + std::to_string(bits) +
-           " data=" + hexBits(value, bits);
-}
 
 }  // namespace OrvNebuBusTest
