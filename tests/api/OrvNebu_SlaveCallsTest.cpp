@@ -1,7 +1,5 @@
 // The exported slave calls where the console cannot reach them: null arguments, host cores
-// under a slave reference, a re-initialize that fails, and raw sizes past 32 bits.
-#include <cstdio>
-
+// under a slave reference, and raw sizes past 32 bits.
 #include "host/OrvCore.h"
 #include "registers/OrvNebu_DefaultRegisterHandler.h"
 #include "support/RegsFixture.h"
@@ -49,22 +47,6 @@ TEST_F(SlaveCallsTest, OneSlaveObjectPerReferenceAndHostCoresLeftToTheHost) {
     ASSERT_EQ(initialize(1), ORVNEBU_OK);
     ASSERT_NE(coreAt(1), nullptr);
     EXPECT_TRUE(coreAt(1)->isOrvNebuSlave());
-}
-
-TEST_F(SlaveCallsTest, AFailedReinitializeReportsAndLeavesNoSlave) {
-    data_.write("missing.csv", "h\nX,0,0,0,15,,rw,,y\n");
-    ASSERT_EQ(initialize(6), ORVNEBU_OK);
-    std::remove(data_.path("missing.csv").c_str());
-    clearMessages();
-    EXPECT_EQ(initialize(6), ORVNEBU_FAILED);
-    auto m = messages();
-    ASSERT_EQ(m.size(), 2u);
-    EXPECT_EQ(m[0].text, "Unable to open OrvNebu register file: " + data_.path("missing.csv"));
-    EXPECT_EQ(m[0].severity, 256u);
-    EXPECT_EQ(m[1].text, "Orv abort command");
-    EXPECT_EQ(m[1].severity, 32768u);
-    EXPECT_EQ(coreAt(6), nullptr);
-    EXPECT_EQ(OrvNebu_DefaultRegisterHandler::getHandlerCount(), 0u);
 }
 
 TEST_F(SlaveCallsTest, NullArgumentsAreRefusedOnceTheSlaveIsResolved) {

@@ -47,7 +47,7 @@ message 256: errorStatusLen must equal to maximum slaves supported.\n
 rc=0x80000000
 errorStatus=4294967295
 # A status for a position past the bus fails after the transfer.
-> singleSlaveRead 0 6 5 0
+> singleSlaveRead 0 6 2 0
 message 256: Invalid slave index (Slave Index >= Maximum Slaves Supported).\n
 rc=0x80000000
 buffer=0x0000
@@ -64,7 +64,7 @@ status=1
 rc=0x00000000
 buffer=0xABCD
 status=1
-> burstSlaveWrite 0 1 1 0 1 1 2
+> burstSlaveWrite 0 1 1 0 1 7
 rc=0x00000000
 status=5
 > singleSlaveReadModifyWrite 0 1 0 0x10 0 0xFFFF

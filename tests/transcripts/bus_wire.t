@@ -131,18 +131,12 @@ jtag write cmd=5 bits=19 data=0x00020
 jtag read cmd=6 bits=48 data=0x000300020001
 rc=0x00000000
 buffer=0x0001 0x0002 0x0003
-> broadcastSingleWrite 0 1 0x30 0x4242
+> broadcastSingleWrite 0 1 0x1FFFF 0x4243
 jtag write cmd=4 bits=29 data=0x00080000
-jtag write cmd=5 bits=19 data=0x20030
-jtag write cmd=6 bits=18 data=0x04242
+jtag write cmd=5 bits=19 data=0x3FFFF
+jtag write cmd=6 bits=18 data=0x04243
 jtag flush
 rc=0x00000000
-> peek 0 1 0 0x10 2
-peek=0xAB12 0x7777
-> peek 0 1 3 0x1FFFF 1
-peek=0x1234
-> peek 0 1 3 0x30 1
-peek=0x4242
 # A position past the bus is sent; only its status would fail.
 > singleSlaveRead 0 1 5 0
 jtag write cmd=4 bits=29 data=0x00500000
@@ -167,6 +161,13 @@ rc=0x80000000
 > broadcastSingleWrite 0 1 0x20010 1
 message 256: Invalid bus address (Address > Maximum Address 0x1FFFF).\n
 rc=0x80000000
+> burstSlaveRead 0 1 256 0 1 1
+message 256: Invalid slave index (Slave Index >= Maximum Slaves Supported).\n
+rc=0x80000000
+buffer=0xFFFFFFFF
+> burstSlaveWrite 0 1 0 0x20000 0 1
+message 256: Invalid bus address (Address > Maximum Address 0x1FFFF).\n
+rc=0x80000000
 > resetSlave 0 1 4
 message 256: Invalid slave index (Slave Index >= Maximum Slaves Supported).\n
 rc=0x80000000
@@ -174,14 +175,15 @@ rc=0x80000000
 message 256: Invalid slave index (Slave Index >= Maximum Slaves Supported).\n
 rc=0x80000000
 # Sessions have their own buses: an ended session discovers anew, another keeps its own.
+# Chain 2 has the most slave positions a master can have.
 > session 2
 > getSlaveHandles 0 2 1
 jtag status device=0 chain=2 core=0 type=14
 jtag status device=0 chain=2 core=0 type=14
-jtag write cmd=1 bits=4 data=0xF
-jtag write cmd=1 bits=4 data=0xE
+jtag write cmd=1 bits=257 data=0x1FFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFF
+jtag write cmd=1 bits=257 data=0x1FFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFFE
 jtag read cmd=2 bits=4 data=0x2
-jtag write cmd=1 bits=4 data=0x0
+jtag write cmd=1 bits=257 data=0x00000000000000000000000000000000000000000000000000000000000000000
 rc=0x00000000
 slaveHandles=0
 > getSlaveHandles 0 2 1
