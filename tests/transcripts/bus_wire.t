@@ -1,6 +1,7 @@
 # nebu --trace --board bus_board.json
-# Discovery: the core list up to the first master, its status, a clock reset where the master
-# has one, then a bus reset polled until done. Commands carry slave count + 2 control bits.
+# Discovery: the core list up to the first master (of two, the lower-indexed one), its status,
+# a clock reset where the master has one, then a bus reset polled until done. Commands carry
+# slave count + 2 control bits.
 > getSlaveCount 0 1
 jtag status device=0 chain=1 core=0 type=3
 jtag status device=0 chain=1 core=1 type=14
@@ -14,17 +15,6 @@ jtag read cmd=2 bits=4 data=0x2
 jtag write cmd=1 bits=6 data=0x00
 rc=0x00000000
 count=4
-# Of two masters the lower-indexed one is the bus.
-> getSlaveCount 0 4
-jtag status device=0 chain=4 core=0 type=3
-jtag status device=0 chain=4 core=1 type=14
-jtag status device=0 chain=4 core=1 type=14
-jtag write cmd=1 bits=5 data=0x1F
-jtag write cmd=1 bits=5 data=0x1E
-jtag read cmd=2 bits=4 data=0x2
-jtag write cmd=1 bits=5 data=0x00
-rc=0x00000000
-count=3
 # No slave positions, no cores, a configuration controller (never probed), no device: no bus.
 > getSlaveCount 0 3
 jtag status device=0 chain=3 core=0 type=14
@@ -186,22 +176,22 @@ jtag read cmd=2 bits=4 data=0x2
 jtag write cmd=1 bits=257 data=0x00000000000000000000000000000000000000000000000000000000000000000
 rc=0x00000000
 slaveHandles=0
-> getSlaveHandles 0 2 1
-rc=0x00000000
-slaveHandles=0
 > endSession 1
 > getSlaveHandles 0 2 1
 rc=0x00000000
 slaveHandles=0
 > session 1
-> getSlaveHandles 0 4 1
-jtag status device=0 chain=4 core=0 type=3
-jtag status device=0 chain=4 core=1 type=14
-jtag status device=0 chain=4 core=1 type=14
-jtag write cmd=1 bits=5 data=0x1F
-jtag write cmd=1 bits=5 data=0x1E
+> getSlaveHandles 0 1 1
+jtag status device=0 chain=1 core=0 type=3
+jtag status device=0 chain=1 core=1 type=14
+jtag status device=0 chain=1 core=1 type=14
+jtag write cmd=7 bits=4 data=0x1
+jtag write cmd=7 bits=4 data=0x0
+jtag read cmd=7 bits=3 data=0x2
+jtag write cmd=1 bits=6 data=0x3F
+jtag write cmd=1 bits=6 data=0x3E
 jtag read cmd=2 bits=4 data=0x2
-jtag write cmd=1 bits=5 data=0x00
+jtag write cmd=1 bits=6 data=0x00
 rc=0x00000000
 slaveHandles=0
 # exit 1
