@@ -121,6 +121,12 @@ jtag write cmd=5 bits=19 data=0x00020
 jtag read cmd=6 bits=48 data=0x000300020001
 rc=0x00000000
 buffer=0x0001 0x0002 0x0003
+> burstSlaveWrite 0 1 0 0x21 1 0x1234
+jtag write cmd=4 bits=29 data=0x00060001
+jtag write cmd=5 bits=19 data=0x20021
+jtag write cmd=6 bits=18 data=0x01234
+jtag flush
+rc=0x00000000
 > broadcastSingleWrite 0 1 0x1FFFF 0x4243
 jtag write cmd=4 bits=29 data=0x00080000
 jtag write cmd=5 bits=19 data=0x3FFFF
