@@ -108,6 +108,9 @@ TEST_F(BusListTest, AConfigurationControllerLeavesTheListAlone) {
 
 TEST_F(BusListTest, ANoticeIsNoEndAndTheListRegistersAgainOnceEmptied) {
     EXPECT_EQ(slaveCount(3, 0, 1), 4u);
+    const uint64_t registrations = OrvSim::listenerRegistrations();
+    EXPECT_EQ(slaveCount(3, 0, 2), 2u);  // a list not empty stays registered once
+    EXPECT_EQ(OrvSim::listenerRegistrations(), registrations);
     OrvRT::OrvNebu_BusList::getBusList()->sessionNotice(3);
     clearLog();
     EXPECT_EQ(touch(3, 0, 1), 0u);

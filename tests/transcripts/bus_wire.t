@@ -52,8 +52,8 @@ rc=0x00000000
 jtag status device=0 chain=1 core=1 type=14
 rc=0x00000000
 dclk_has_reset=1
-period_frc=5
-period_int=10
+period_frc=517
+period_int=1000
 # The slave information is the text of its eight identification words, one burst.
 > getSlaveInfo 0 1 0 mine=stays slave_type=replaced
 jtag write cmd=4 bits=29 data=0x00060008
