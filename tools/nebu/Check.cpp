@@ -31,9 +31,11 @@ namespace {
 const std::string HEADER = "# nebu";
 const std::string EXIT = "# exit ";
 const std::string COMMAND = "> ";
+const std::string PROGRAM = "$ nebu";
 
 struct Transcript {
     std::string path;
+    std::string folder;
     std::vector<std::string> lines;
     Options options;
 };
@@ -47,8 +49,15 @@ bool isComment(const std::string& line) { return line.empty() || line[0] == '#';
 
 bool isCommand(const std::string& line) { return line.compare(0, COMMAND.size(), COMMAND) == 0; }
 
+bool isProgram(const std::string& line) {
+    return line.compare(0, PROGRAM.size(), PROGRAM) == 0 &&
+           (line.size() == PROGRAM.size() || line[PROGRAM.size()] == ' ');
+}
+
 std::string escapeLine(const std::string& line) {
-    if (line.empty() || line[0] == '#' || line[0] == '>' || line[0] == '\\') return '\\' + line;
+    if (line.empty() || line[0] == '#' || line[0] == '>' || line[0] == '$' || line[0] == '\\') {
+        return '\\' + line;
+    }
     return line;
 }
 
@@ -88,15 +97,40 @@ Transcript readTranscript(const std::string& path) {
         throw UsageError(path + ":1: only console options belong on the first line");
     }
     const std::string folder = std::filesystem::path(path).parent_path().string();
+    t.folder = folder;
     t.options.boardFile = relativeTo(folder, t.options.boardFile);
     t.options.dataDir = relativeTo(folder, t.options.dataDir);
     t.options.pluginPath = relativeTo(folder, t.options.pluginPath);
     return t;
 }
 
+// A "$ nebu ARGS" line: the program run with those arguments in the transcript's folder, with
+// nothing on its standard input; what it printed, then "[exit N]" unless N is 0.
+std::string runProgram(const Transcript& t, const std::string& line) {
+    std::vector<std::string> args = {"nebu"};
+    for (auto& word : splitWords(line.substr(PROGRAM.size()))) args.push_back(word);
+    std::vector<char*> argv;
+    for (auto& arg : args) argv.push_back(arg.data());
+    argv.push_back(nullptr);
+    const std::filesystem::path before = std::filesystem::current_path();
+    if (!t.folder.empty()) std::filesystem::current_path(t.folder);
+    std::istringstream in;
+    std::ostringstream output;
+    const int status =
+        runNebu(static_cast<int>(args.size()), argv.data(), in, output, output, false);
+    std::filesystem::current_path(before);
+    OrvSim::resetHost();
+    return output.str() + (status == 0 ? "" : "[exit " + std::to_string(status) + "]\n");
+}
+
 // The transcript as this run writes it: the first line, comments and commands where they
 // stand, each command followed by what it printed, then the exit status.
 std::vector<std::string> runTranscript(const Transcript& t, const std::string& exeDir) {
+    // Program runs come first: each is a console of its own, done before this one starts.
+    std::vector<std::string> programOutput(t.lines.size());
+    for (size_t i = 1; i < t.lines.size(); ++i) {
+        if (isProgram(t.lines[i])) programOutput[i] = runProgram(t, t.lines[i]);
+    }
     std::vector<size_t> commandLines;
     for (size_t i = 1; i < t.lines.size(); ++i) {
         if (isCommand(t.lines[i])) commandLines.push_back(i);
@@ -117,7 +151,11 @@ std::vector<std::string> runTranscript(const Transcript& t, const std::string& e
     std::vector<std::string> actual = {t.lines[0]};
     size_t c = 0;
     for (size_t i = 1; i < t.lines.size(); ++i) {
-        if (isCommand(t.lines[i])) {
+        if (isProgram(t.lines[i])) {
+            actual.push_back(t.lines[i]);
+            for (const auto& line : splitLines(programOutput[i]))
+                actual.push_back(escapeLine(line));
+        } else if (isCommand(t.lines[i])) {
             // The echo comes first, as the command stands; output lines are escaped.
             const std::vector<std::string> lines = splitLines(printed[c++]);
             for (size_t l = 0; l < lines.size(); ++l) {
