@@ -21,6 +21,8 @@ cli_lint/many/c_regs.csv:1: the first line is a register line, but the first lin
 cli_lint/many/d_regs.csv:1: line ends are carriage returns alone: the plug-in reads the whole file as one header line and finds no registers
 cli_lint/many/e_params.csv:3: choice_index out-of-order (the plug-in refuses the file)
 cli_lint/many/g_regs.csv:2: line of 4 columns: a register line needs 9 columns (the plug-in refuses the file)
+cli_lint/many/h5_params.csv:2: row of 1 field: a row needs 4 (parameter, choice index, choice, settings) (the plug-in refuses the file)
+cli_lint/many/h5_params.csv:3: setting B is not of the form REGISTER=bits (the plug-in refuses the file)
 cli_lint/many/orvnebu_directory.csv:3: Unable to open OrvNebu register file: cli_lint/many/missing_regs.csv
 cli_lint/many/orvnebu_directory.csv:4: Unable to open OrvNebu register file: cli_lint/many/b_regs.csv  (blanks around the name are part of it)
 cli_lint/many/orvnebu_directory.csv:5: Unable to open OrvNebu parameter file: cli_lint/many/missing_params.csv
@@ -31,7 +33,8 @@ cli_lint/many/orvnebu_directory.csv:9: line of 2 fields is never used: the key c
 cli_lint/many/orvnebu_directory.csv:12: slave type 0x45 (R3Qrb transceiver) has no parameter file, so none of its computed parameters
 cli_lint/many/orvnebu_directory.csv:12: slave type 0x45 (R3Qrb transceiver) needs register RXUSERCLKOUT_FREQ_CNT2, which cli_lint/many/f_regs.csv lacks
 cli_lint/many/orvnebu_directory.csv:13: slave type 0x42 (R2Qra transceiver) needs parameter pll_divsel_ref, which cli_lint/many/f_params.csv lacks
-lint cli_lint/many/: 12 directory lines, 11 definition files, 25 problems
+cli_lint/many/r5_regs.csv:1: the first line is a register line, but the first line of a register file is its header: register X is lost
+lint cli_lint/many/: 23 directory lines, 22 definition files, 28 problems
 [exit 1]
 $ nebu lint cli_lint
 cli_lint/orvnebu_directory.csv: Unable to open cli_lint/orvnebu_directory.csv
@@ -45,6 +48,19 @@ lint cli_lint/bom/: 0 directory lines, 0 definition files, 2 problems
 $ nebu lint cli_lint/header
 cli_lint/header/orvnebu_directory.csv:1: Unable to parse header of CSV file: cli_lint/header/orvnebu_directory.csv: it has no orv_drv_ver_max column
 lint cli_lint/header/: 0 directory lines, 0 definition files, 1 problem
+[exit 1]
+$ nebu lint cli_lint/narrow
+cli_lint/narrow/orvnebu_directory.csv:1: Unable to parse header of CSV file: cli_lint/narrow/orvnebu_directory.csv: it has 1 column, at least 5 are needed
+lint cli_lint/narrow/: 0 directory lines, 0 definition files, 1 problem
+[exit 1]
+$ nebu lint cli_lint/noregs
+cli_lint/noregs/orvnebu_directory.csv:1: the header has no registers column: no slave can be created
+cli_lint/noregs/orvnebu_directory.csv:2: Unable to open OrvNebu parameter file: cli_lint/noregs/x.csv
+lint cli_lint/noregs/: 2 directory lines, 0 definition files, 2 problems
+[exit 1]
+$ nebu lint cli_lint/regsfirst
+cli_lint/regsfirst/orvnebu_directory.csv:2: slave type 0x31 has no register file: its slaves cannot be created
+lint cli_lint/regsfirst/: 2 directory lines, 1 definition files, 1 problem
 [exit 1]
 $ nebu lint cli_lint/absent
 nebu: lint: no data directory 'cli_lint/absent'
