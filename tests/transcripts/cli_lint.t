@@ -6,13 +6,13 @@ lint ../../data/: 9 directory lines, 12 definition files, no problems
 $ nebu lint ../../data/
 lint ../../data/: 9 directory lines, 12 definition files, no problems
 $ nebu lint cli_lint/many
-cli_lint/many/a_params.csv:3: parameter mode, choice run: value 0x3 of register LOOP needs 2 bits, the register has 1
+cli_lint/many/a_params.csv:3: parameter mode, choice run: value 0x4 of register LOOP needs 3 bits, the register has 1
 cli_lint/many/a_params.csv:4: parameter mode, choice loop: register LOOPER is not in cli_lint/many/a_regs.csv
 cli_lint/many/a_regs.csv:4: register OVER overlaps register MODE (line 2) in bit 3 of word 0x0
 cli_lint/many/a_regs.csv:4: register OVER overlaps register LOOP (line 3) in bit 4 of word 0x0
 cli_lint/many/a_regs.csv:5: register MODE holds bits 2 to 3 of word 0x0 twice (also on line 2): a value written does not read back
 cli_lint/many/a_regs.csv:5: register MODE overlaps register OVER (line 4) in bit 3 of word 0x0
-cli_lint/many/a_regs.csv:6: register WIDE: bits 12 to 20 of word 0x1f lie beyond the 16-bit bus word
+cli_lint/many/a_regs.csv:6: register WIDE: bits 12 to 16 of word 0x1f lie beyond the 16-bit bus word
 cli_lint/many/a_regs.csv:7: slice without a register name: no call can reach it
 cli_lint/many/a_regs.csv:8: registers span words 0x0 (line 2) to 0x1ffff (line 8): 131072 words, more than one burst moves (131071), so a read of every register fails
 cli_lint/many/c_params.csv:1: the first line is a parameter row, but the first line of a parameter file is its header: choice off of parameter mode is lost
@@ -20,6 +20,7 @@ cli_lint/many/c_params.csv:2: choice_index out-of-order (the plug-in refuses the
 cli_lint/many/c_regs.csv:1: the first line is a register line, but the first line of a register file is its header: register C is lost
 cli_lint/many/d_regs.csv:1: line ends are carriage returns alone: the plug-in reads the whole file as one header line and finds no registers
 cli_lint/many/e_params.csv:3: choice_index out-of-order (the plug-in refuses the file)
+cli_lint/many/e_params.csv:5: choice_index out-of-order (the plug-in refuses the file)
 cli_lint/many/g_regs.csv:2: line of 4 columns: a register line needs 9 columns (the plug-in refuses the file)
 cli_lint/many/h5_params.csv:2: row of 1 field: a row needs 4 (parameter, choice index, choice, settings) (the plug-in refuses the file)
 cli_lint/many/h5_params.csv:3: setting B is not of the form REGISTER=bits (the plug-in refuses the file)
@@ -34,7 +35,7 @@ cli_lint/many/orvnebu_directory.csv:12: slave type 0x45 (R3Qrb transceiver) has 
 cli_lint/many/orvnebu_directory.csv:12: slave type 0x45 (R3Qrb transceiver) needs register RXUSERCLKOUT_FREQ_CNT2, which cli_lint/many/f_regs.csv lacks
 cli_lint/many/orvnebu_directory.csv:13: slave type 0x42 (R2Qra transceiver) needs parameter pll_divsel_ref, which cli_lint/many/f_params.csv lacks
 cli_lint/many/r5_regs.csv:1: the first line is a register line, but the first line of a register file is its header: register X is lost
-lint cli_lint/many/: 23 directory lines, 22 definition files, 28 problems
+lint cli_lint/many/: 24 directory lines, 22 definition files, 29 problems
 [exit 1]
 $ nebu lint cli_lint
 cli_lint/orvnebu_directory.csv: Unable to open cli_lint/orvnebu_directory.csv

@@ -14,13 +14,12 @@ buffer=0x1234
 status=0
 \> stats
 stats commands=12 writeBits=86 readBits=37 flushes=0 statusReads=4 roundTrips=9 cableUs=10
-$ nebu --tck-mhz=1e1 --round-trip-us .5 -e "singleSlaveRead 0 1 0 3" -e stats
-\> singleSlaveRead 0 1 0 3
+$ nebu --tck-mhz=1e1 --round-trip-us .5 -e "getSlaveCount 0 1" -e stats
+\> getSlaveCount 0 1
 rc=0x00000000
-buffer=0x1234
-status=0
+count=8
 \> stats
-stats commands=12 writeBits=86 readBits=37 flushes=0 statusReads=4 roundTrips=9 cableUs=17
+stats commands=8 writeBits=38 readBits=11 flushes=0 statusReads=4 roundTrips=7 cableUs=8
 $ nebu --help
 usage: nebu [--board FILE] [--data-dir DIR] [--session N] [--trace] [--plugin PATH] [--tck-mhz F]
             [--round-trip-us R] [-e COMMAND]... [SCRIPT]
