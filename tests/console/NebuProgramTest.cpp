@@ -1,5 +1,5 @@
 // The built nebu program where a transcript cannot take it: another library as the plug-in, a
-// terminal, and `nebu check --update` rewriting a file.
+// terminal, a path of the platform's own form, and `nebu check --update` rewriting a file.
 #include <gtest/gtest.h>
 
 #if !defined(_WIN32)
@@ -140,6 +140,15 @@ TEST_F(NebuProgramTest, TerminalInputGetsAPrompt) {
 }
 
 #endif
+
+// '\' on Windows: the platform's separator at the end gets no second one.
+TEST_F(NebuProgramTest, LintTakesTheDataDirectoryEndingInTheSeparator) {
+    const std::string separated = (fs::path(NEBU_TEST_DATA_DIR) / "").string();
+    const Result r = run({"lint", separated});
+    EXPECT_EQ(r.status, 0);
+    EXPECT_EQ(r.out,
+              "lint " + separated + ": 9 directory lines, 12 definition files, no problems\n");
+}
 
 TEST_F(NebuProgramTest, CheckUpdateWritesWhatRan) {
     const std::string t = write("session.t",

@@ -22,6 +22,9 @@ nebu: cli_board/absent.json: cannot be read: No such file or directory
 $ nebu --board cli_board/broken.json -e stats
 nebu: cli_board/broken.json: not valid JSON: parse error at line 1, column 26: syntax error while parsing value - unexpected end of input; expected '[', '{', or a literal
 [exit 2]
+$ nebu --board cli_board -e stats
+nebu: cli_board: cannot be read: Is a directory
+[exit 2]
 $ nebu check cli_board/session.t
 cli_board/session.t:4: output differs
 --- cli_board/session.t
