@@ -7,6 +7,7 @@
 #include <cstdint>
 #include <filesystem>
 #include <fstream>
+#include <functional>
 #include <ostream>
 #include <sstream>
 #include <string>
@@ -104,6 +105,46 @@ Transcript readTranscript(const std::string& path) {
     return t;
 }
 
+#if defined(_WIN32)
+std::string isolated(const std::function<std::string()>& run, std::string& failure) {
+    failure.clear();
+    return run();
+}
+#else
+// In a child process: a host and a plug-in of its own, and a crash stays the child's.
+std::string isolated(const std::function<std::string()>& run, std::string& failure) {
+    failure.clear();
+    int fds[2];
+    if (pipe(fds) != 0) throw UsageError("cannot create a pipe");
+    const pid_t pid = fork();
+    if (pid < 0) throw UsageError("cannot start a process");
+    if (pid == 0) {
+        close(fds[0]);
+        const std::string text = run();
+        for (size_t done = 0; done < text.size();) {
+            const ssize_t n = write(fds[1], text.data() + done, text.size() - done);
+            if (n <= 0) _exit(3);
+            done += static_cast<size_t>(n);
+        }
+        _exit(0);
+    }
+    close(fds[1]);
+    std::string text;
+    char buffer[4096];
+    ssize_t n;
+    while ((n = read(fds[0], buffer, sizeof buffer)) > 0) text.append(buffer, n);
+    close(fds[0]);
+    int wait = 0;
+    waitpid(pid, &wait, 0);
+    if (WIFSIGNALED(wait)) {
+        failure = "the console was killed by signal " + std::to_string(WTERMSIG(wait));
+    } else if (!WIFEXITED(wait) || WEXITSTATUS(wait) != 0) {
+        failure = "the console did not finish";
+    }
+    return text;
+}
+#endif
+
 // A "$ nebu ARGS" line: the program run with those arguments in the transcript's folder, with
 // nothing on its standard input; what it printed, then "[exit N]" unless N is 0.
 std::string runProgram(const Transcript& t, const std::string& line) {
@@ -126,10 +167,14 @@ std::string runProgram(const Transcript& t, const std::string& line) {
 // The transcript as this run writes it: the first line, comments and commands where they
 // stand, each command followed by what it printed, then the exit status.
 std::vector<std::string> runTranscript(const Transcript& t, const std::string& exeDir) {
-    // Program runs come first: each is a console of its own, done before this one starts.
+    // Program runs come first: each is a process of its own (on POSIX), done before this
+    // console starts.
     std::vector<std::string> programOutput(t.lines.size());
     for (size_t i = 1; i < t.lines.size(); ++i) {
-        if (isProgram(t.lines[i])) programOutput[i] = runProgram(t, t.lines[i]);
+        if (!isProgram(t.lines[i])) continue;
+        std::string failure;
+        programOutput[i] = isolated([&] { return runProgram(t, t.lines[i]); }, failure);
+        if (!failure.empty()) programOutput[i] += "[" + failure + "]\n";
     }
     std::vector<size_t> commandLines;
     for (size_t i = 1; i < t.lines.size(); ++i) {
@@ -171,48 +216,16 @@ std::vector<std::string> runTranscript(const Transcript& t, const std::string& e
     return actual;
 }
 
-#if defined(_WIN32)
 std::vector<std::string> runIsolated(const Transcript& t, const std::string& exeDir,
                                      std::string& failure) {
-    failure.clear();
-    return runTranscript(t, exeDir);
+    return splitLines(isolated(
+        [&] {
+            std::string text;
+            for (const auto& line : runTranscript(t, exeDir)) text += line + '\n';
+            return text;
+        },
+        failure));
 }
-#else
-// In a child process: a host and a plug-in of its own, and a crash stays the child's.
-std::vector<std::string> runIsolated(const Transcript& t, const std::string& exeDir,
-                                     std::string& failure) {
-    failure.clear();
-    int fds[2];
-    if (pipe(fds) != 0) throw UsageError("cannot create a pipe");
-    const pid_t pid = fork();
-    if (pid < 0) throw UsageError("cannot start a process");
-    if (pid == 0) {
-        close(fds[0]);
-        std::string text;
-        for (const auto& line : runTranscript(t, exeDir)) text += line + '\n';
-        for (size_t done = 0; done < text.size();) {
-            const ssize_t n = write(fds[1], text.data() + done, text.size() - done);
-            if (n <= 0) _exit(3);
-            done += static_cast<size_t>(n);
-        }
-        _exit(0);
-    }
-    close(fds[1]);
-    std::string text;
-    char buffer[4096];
-    ssize_t n;
-    while ((n = read(fds[0], buffer, sizeof buffer)) > 0) text.append(buffer, n);
-    close(fds[0]);
-    int wait = 0;
-    waitpid(pid, &wait, 0);
-    if (WIFSIGNALED(wait)) {
-        failure = "the console was killed by signal " + std::to_string(WTERMSIG(wait));
-    } else if (!WIFEXITED(wait) || WEXITSTATUS(wait) != 0) {
-        failure = "the console did not finish";
-    }
-    return splitLines(text);
-}
-#endif
 
 // Longest common subsequence of the lines between the common head and tail, as a list of
 // edits: ' ' kept, '-' only expected, '+' only actual, with the line indices.
