@@ -25,7 +25,6 @@ public:
     // dataDir ends with a separator, as the host's data directory does.
     explicit OrvNebu_DataDirectory(const std::string& dataDir);
 
-    const std::string& dataDir() const { return dataDir_; }
     const OrvNebu_DirectoryFile& directory() const { return directory_; }
     // The files a row names, by the full path the plug-in opens; null when it names none.
     const OrvNebu_RegisterFile* registerFile(const Row& row) const;

@@ -28,13 +28,7 @@ OrvNebu_DirectoryFile::OrvNebu_DirectoryFile(const std::string& path, Reading re
     std::string line;
     // A directory in the file's place opens, but reading it fails.
     if (!in.is_open() || (!std::getline(in, line) && in.bad())) {
-        const std::string text = "Unable to open " + path_;
-        problems_.push_back({path_,
-                             0,
-                             0,
-                             OrvNebu_FileProblem::SEVERITY_ERROR,
-                             text,
-                             {{OrvNebu_FileProblem::SEVERITY_ERROR, text}}});
+        problems_.push_back(OrvNebu_FileProblem::unreadable(path_, "Unable to open " + path_));
         return;
     }
     readHeader(line, reading);

@@ -41,10 +41,6 @@ public:
     explicit OrvNebu_DirectoryFile(const std::string& path, Reading reading = FIRST_REFUSAL);
 
     const std::string& path() const { return path_; }
-    // False when the file cannot be opened or its header is unusable; then there are no rows.
-    bool usable() const { return usable_; }
-    // The header's fields, lowercased and trimmed: the keys of a delivered entry.
-    const std::vector<std::string>& headerFields() const { return headerFields_; }
     // Every line with more fields than the highest key column, in file order.
     const std::vector<Row>& rows() const { return rows_; }
     // The first row that covers the slave type and driver version, or null.

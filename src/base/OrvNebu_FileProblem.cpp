@@ -5,6 +5,11 @@
 
 namespace OrvRT {
 
+OrvNebu_FileProblem OrvNebu_FileProblem::unreadable(const std::string& file,
+                                                    const std::string& text) {
+    return {file, 0, 0, SEVERITY_ERROR, text, {{SEVERITY_ERROR, text}}};
+}
+
 const OrvNebu_FileProblem* OrvNebu_FileProblem::firstRefusal(
     const std::vector<OrvNebu_FileProblem>& all) {
     for (const OrvNebu_FileProblem& problem : all) {

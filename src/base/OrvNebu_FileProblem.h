@@ -29,6 +29,8 @@ struct OrvNebu_FileProblem {
 
     bool refusesFile() const { return !messages.empty(); }
 
+    // A file the plug-in cannot read at all: it sends the text alone, as an error.
+    static OrvNebu_FileProblem unreadable(const std::string& file, const std::string& text);
     // The first problem that refuses its file, or null.
     static const OrvNebu_FileProblem* firstRefusal(const std::vector<OrvNebu_FileProblem>& all);
     // Sends the problem's messages on the session channel.

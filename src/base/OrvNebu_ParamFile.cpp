@@ -65,13 +65,8 @@ OrvNebu_ParamFile::OrvNebu_ParamFile(const std::string& path, Reading reading) :
     if (!opened_) {
         parameters_.clear();
         problems_.clear();
-        const std::string text = "Unable to open OrvNebu parameter file: " + path_;
-        problems_.push_back({path_,
-                             0,
-                             0,
-                             OrvNebu_FileProblem::SEVERITY_ERROR,
-                             text,
-                             {{OrvNebu_FileProblem::SEVERITY_ERROR, text}}});
+        problems_.push_back(OrvNebu_FileProblem::unreadable(
+            path_, "Unable to open OrvNebu parameter file: " + path_));
     }
 }
 

@@ -81,13 +81,8 @@ OrvNebu_RegisterFile::OrvNebu_RegisterFile(const std::string& path, Reading read
         minAddress_ = 0xFFFFFFFFu;
         maxAddress_ = 0;
         problems_.clear();
-        const std::string text = "Unable to open OrvNebu register file: " + path_;
-        problems_.push_back({path_,
-                             0,
-                             0,
-                             OrvNebu_FileProblem::SEVERITY_ERROR,
-                             text,
-                             {{OrvNebu_FileProblem::SEVERITY_ERROR, text}}});
+        problems_.push_back(OrvNebu_FileProblem::unreadable(
+            path_, "Unable to open OrvNebu register file: " + path_));
         return;
     }
     if (reading == EVERY_PROBLEM) {

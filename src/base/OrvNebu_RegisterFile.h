@@ -78,7 +78,6 @@ public:
     const std::string& path() const { return path_; }
     // False when the file could not be opened or read at all.
     bool opened() const { return opened_; }
-    const std::string& header() const { return header_; }
     // Every line that parsed, in file order, excluded ones too.
     const std::deque<RegisterSlice>& lines() const { return lines_; }
     const std::unordered_map<std::string, Register>& registers() const { return registers_; }

@@ -95,8 +95,6 @@ public:
     // Receives bitCount (<= 32) bits into *value.
     virtual uint32_t readCommand(uint32_t handle, uint32_t cmd, uint32_t* value, uint32_t bitCount);
 
-    const ORV_CORE_REF& getCoreRef() const { return coreRef_; }
-
 private:
     // Writes strobe then hold, polls the master for completion and clears the control word;
     // throws the timeout after the last poll.

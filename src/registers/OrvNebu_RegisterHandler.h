@@ -32,8 +32,6 @@ public:
                               Orv_HashMapCStr* registers) = 0;
     virtual std::string getRegFilename() const { return regFilename_; }
 
-    // The file as read; null before the derived constructor read it.
-    const OrvNebu_RegisterFile* getFile() const { return file_.get(); }
     size_t getRegisterCount() const { return file_->registers().size(); }
     // Lowest and highest address of all included lines (0xFFFFFFFF and 0 for none).
     uint32_t getMinAddress() const { return file_->minAddress(); }

@@ -9,6 +9,7 @@
 #include <string>
 #include <vector>
 
+#include "base/OrvNebu_NameMaps.h"
 #include "params/OrvNebu_DefaultParamReader.h"
 #include "registers/OrvNebu_DefaultRegisterHandler.h"
 #include "registers/OrvNebu_SingleRegisterHandler.h"
@@ -78,7 +79,7 @@ OrvNebu_Slave* OrvNebu_DefaultSlave::create(uint32_t handle, const ORV_CORE_INFO
 OrvNebu_DefaultSlave::OrvNebu_DefaultSlave(uint32_t handle, const ORV_SLAVE_REF& slaveRef,
                                            const ORV_CORE_INFO& coreInfo,
                                            const Orv_HashMapCStr& slaveInfo)
-    : OrvNebu_Slave(handle, slaveRef, coreInfo, slaveInfo), actions_(100) {}
+    : OrvNebu_Slave(handle, slaveRef, coreInfo, slaveInfo), actions_(ORVNEBU_MAP_BUCKETS) {}
 
 OrvNebu_DefaultSlave::~OrvNebu_DefaultSlave() {
     if (handlerCounted_) {
@@ -125,14 +126,14 @@ void OrvNebu_DefaultSlave::setRegisters(uint32_t handle, const ORV_SLAVE_REF& sl
 
 void OrvNebu_DefaultSlave::setParameters(uint32_t handle, const ORV_SLAVE_REF& slaveRef,
                                          Orv_HashMapCStr* params) {
-    Orv_HashMapCStr registers(100);
+    Orv_HashMapCStr registers(ORVNEBU_MAP_BUCKETS);
     setParametersInRegisterHashMap(handle, params, &registers);
     setRegisters(handle, slaveRef, &registers);
 }
 
 void OrvNebu_DefaultSlave::getParameters(uint32_t handle, const ORV_SLAVE_REF& slaveRef,
                                          Orv_HashMapCStr* params) {
-    Orv_HashMapCStr registers(100);
+    Orv_HashMapCStr registers(ORVNEBU_MAP_BUCKETS);
     const bool allParams = params->empty();
     const ActionList list = allParams ? allActions(actions_) : requestedActions(*this, *params);
     for (OrvNebu_ParamAction* action : list) action->getRegsToRead(registers);

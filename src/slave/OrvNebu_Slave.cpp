@@ -5,6 +5,7 @@
 #include <stdexcept>
 
 #include "base/OrvNebu_CsvText.h"
+#include "base/OrvNebu_NameMaps.h"
 
 namespace OrvRT {
 
@@ -107,7 +108,7 @@ OrvNebu_Slave* OrvNebu_Slave::getPreviousSlave() {
 std::string OrvNebu_Slave::getParamFromOtherSlave(OrvNebu_Slave* other, const char* name,
                                                   const std::string& def) {
     if (other == nullptr) return def;
-    Orv_HashMapCStr params(100);
+    Orv_HashMapCStr params(ORVNEBU_MAP_BUCKETS);
     const std::string key = name != nullptr ? name : "";
     params[key] = def;
     ORV_SLAVE_REF ref = other->getSlaveRef();

@@ -41,10 +41,8 @@ public:
                                      Orv_HashMapCStr* params, std::vector<std::string>* choices);
 
     uint32_t getOwnerHandle() const { return ownerHandle_; }
-    uint32_t getBusHandle() const { return getUserRegNumber(); }
     uint32_t getSlaveIndex() const { return getCoreIndex(); }
     ORV_SLAVE_REF getSlaveRef() const;
-    const Orv_HashMapCStr& getSlaveInfo() const { return slaveInfo_; }
 
     // The slave next_slave points to, or null.
     OrvNebu_Slave* getNextSlave();

@@ -4,6 +4,7 @@
 #include <stdexcept>
 
 #include "base/OrvNebu_CsvText.h"
+#include "base/OrvNebu_NameMaps.h"
 #include "host/OrvUtil.h"
 #include "slave/OrvNebu_DefaultSlave.h"
 #include "slave/OrvNebu_DirectoryReader.h"
@@ -37,7 +38,7 @@ OrvNebu_Slave* OrvNebu_SlaveFactory::create(uint32_t handle, const ORV_SLAVE_REF
     const int32_t driverVersion = OrvNebu_CsvText::decimalToInt32(versionText);
 
     const std::string dataDir = Orv_Util::getVanduDataDirPath();
-    Orv_HashMapCStr entry(100);
+    Orv_HashMapCStr entry(ORVNEBU_MAP_BUCKETS);
     OrvNebu_DirectoryReader::getEntry(handle, dataDir + DIRECTORY_FILE_NAME, slaveType,
                                       driverVersion, entry);
     std::string registerFile = valueOf(entry, "registers");

@@ -3,6 +3,7 @@
 
 #include <stdexcept>
 
+#include "base/OrvNebu_NameMaps.h"
 #include "slave/OrvNebu_DefaultSlave.h"
 #include "transceiver/OrvNebu_XcvrNumber.h"
 
@@ -48,7 +49,7 @@ void OrvNebu_LineRateParamAction::readRegsAndUpdateParams(bool allParams,
     }
     const int64_t refclk = OrvNebu_XcvrNumber::readLld(found->second);
 
-    Orv_HashMapCStr current(100);
+    Orv_HashMapCStr current(ORVNEBU_MAP_BUCKETS);
     for (OrvNebu_ParamAction* action : subActions_) {
         action->readRegsAndUpdateParams(false, registers, current);
     }

@@ -7,6 +7,7 @@
 #include <cstdlib>
 #include <stdexcept>
 
+#include "base/OrvNebu_NameMaps.h"
 #include "host/OrvUtil.h"
 #include "slave/OrvNebu_DefaultSlave.h"
 #include "transceiver/OrvNebu_XcvrNumber.h"
@@ -69,7 +70,7 @@ void OrvNebu_PllLineRateParamAction::readRegsAndUpdateParams(bool allParams,
     }
     const double refclk = OrvNebu_XcvrNumber::readDouble(found->second);
 
-    Orv_HashMapCStr current(100);
+    Orv_HashMapCStr current(ORVNEBU_MAP_BUCKETS);
     for (OrvNebu_ParamAction* action : subActions_) {
         action->readRegsAndUpdateParams(false, registers, current);
     }
@@ -107,12 +108,12 @@ OrvNebu_PllLineRateParamAction::DividerChoices
 OrvNebu_PllLineRateParamAction::readDividerChoices() {
     const uint32_t handle = slave_->getOwnerHandle();
     const ORV_SLAVE_REF slaveRef = slave_->getSlaveRef();
-    Orv_HashMapCStr registers(100);
+    Orv_HashMapCStr registers(ORVNEBU_MAP_BUCKETS);
     registers[MAX_LINERATE];
     if (oversampling_) registers[TX_OVERSAMPLE_MODE];
     slave_->getRegisters(handle, slaveRef, &registers);
 
-    Orv_HashMapCStr factorValues(100);
+    Orv_HashMapCStr factorValues(ORVNEBU_MAP_BUCKETS);
     for (const std::string& name : factorParams_) factorValues[name];
     slave_->getParameters(handle, slaveRef, &factorValues);
 
@@ -120,7 +121,7 @@ OrvNebu_PllLineRateParamAction::readDividerChoices() {
     d.factor = dividerFactor(factorValues);
     const std::string* dividerNames[3] = {&fbName_, &refName_, &divselName_};
     for (int i = 0; i < 3; ++i) {
-        Orv_HashMapCStr request(100);
+        Orv_HashMapCStr request(ORVNEBU_MAP_BUCKETS);
         request[*dividerNames[i]];
         slave_->getParameterChoices(handle, slaveRef, &request, &d.lists[i]);
     }
@@ -165,7 +166,7 @@ void OrvNebu_PllLineRateParamAction::setParams(Orv_HashMapCStr& params,
 
     const uint32_t handle = slave_->getOwnerHandle();
     const ORV_SLAVE_REF slaveRef = slave_->getSlaveRef();
-    Orv_HashMapCStr widthValue(100);
+    Orv_HashMapCStr widthValue(ORVNEBU_MAP_BUCKETS);
     widthValue[widthName_];
     slave_->getParameters(handle, slaveRef, &widthValue);
     const uint64_t dataWidth = Orv_NumberUtil::decStr2ULL(widthValue[widthName_]);
@@ -179,7 +180,7 @@ void OrvNebu_PllLineRateParamAction::setParams(Orv_HashMapCStr& params,
     }
     calcTuneValues(rate, dataWidth, params, registers);
 
-    Orv_HashMapCStr settings(100);
+    Orv_HashMapCStr settings(ORVNEBU_MAP_BUCKETS);
     dividerSettings(fb, ref, divsel, settings);
     slave_->setParametersInRegisterHashMap(handle, &settings, &registers);
 }
