@@ -168,6 +168,16 @@ TEST(DefinitionFiles, ProblemsWherePlacedAndWhatIsKept) {
          "header: register A is lost\n"
          "lines 2 B/4",
          "lines 2 B/4"},
+        // First lines that are not register lines, and one that is.
+        {'r', "A,zz,0,0,3,,rw,,y\nB,2,0,0,3,,rw,,y\n", "lines 2 B/4", SAME},
+        {'r', "A,1,x,0,3,,rw,,y\nB,2,0,0,3,,rw,,y\n", "lines 2 B/4", SAME},
+        {'r', "A,1,0,x,3,,rw,,y\nB,2,0,0,3,,rw,,y\n", "lines 2 B/4", SAME},
+        {'r', "A,1,.,0,3,,rw,,y\nB,2,0,0,3,,rw,,y\n", "lines 2 B/4", SAME},
+        {'r', "A,1,+5,0,3,,rw,,y\nB,2,0,0,3,,rw,,y\n",
+         "1:0:0 the first line is a register line, but the first line of a register file is its "
+         "header: register A is lost\n"
+         "lines 2 B/4",
+         "lines 2 B/4"},
         {'r', "h\rx\nA,1,0,0,3,,rw,,y\n",
          "1:0:0 line ends are carriage returns alone: the plug-in reads the whole file as one "
          "header line and finds no registers\n"
@@ -190,8 +200,8 @@ TEST(DefinitionFiles, ProblemsWherePlacedAndWhatIsKept) {
         {'r',
          "h\n,1,0,0,0,,rw,,y\nA,1,0,20,17,,rw,,y\nA,2,0,0,3,,rw,,y\nA,2,1,3,3,,rw,,y\n"
          "B,2,0,0,1,,rw,,y\nC,3,0,0,31,,r,,y\nD,3,0,31,0,,r,,y\nE,3,0,4,4,,w,,y\n"
-         "F,4,0,0,30,,rw,,y\nG,4,0,31,31,,rw,,y\nH,0,0,0,0,,r,,y\nI,1fffe,0,0,0,,r,,y\nJ,1ffff,0,0,"
-         "0,,r,,y\n",
+         "F,4,0,0,30,,rw,,y\nG,4,0,31,31,,rw,,y\nJ,1ffff,0,0,0,,r,,y\nI,1fffe,0,0,0,,r,,y\n"
+         "H,0,0,0,0,,r,,y\n",
          "2:1:0 slice without a register name: no call can reach it\n"
          "3:4:0 register A: bits 17 to 20 of word 0x1 lie beyond the 16-bit bus word\n"
          "5:4:0 register A holds bit 3 of word 0x2 twice (also on line 4): a value written does "
@@ -203,7 +213,7 @@ TEST(DefinitionFiles, ProblemsWherePlacedAndWhatIsKept) {
          "9:4:0 register E overlaps register D (line 8) in bit 4 of word 0x3\n"
          "10:4:0 register F: bits 0 to 30 of word 0x4 lie beyond the 16-bit bus word\n"
          "11:4:0 register G: bit 31 of word 0x4 lie beyond the 16-bit bus word\n"
-         "14:2:0 registers span words 0x0 (line 12) to 0x1ffff (line 14): 131072 words, more than "
+         "14:2:0 registers span words 0x0 (line 14) to 0x1ffff (line 12): 131072 words, more than "
          "one burst moves (131071), so a read of every register fails\n"
          "lines 2 3 4 5 6 7 8 9 10 11 12 13 14 A/9 B/2 C/32 D/32 E/1 F/31 G/1 H/1 I/1 J/1",
          "lines 2 3 4 5 6 7 8 9 10 11 12 13 14 A/9 B/2 C/32 D/32 E/1 F/31 G/1 H/1 I/1 J/1"},
@@ -233,10 +243,11 @@ TEST(DefinitionFiles, ProblemsWherePlacedAndWhatIsKept) {
          "header line and finds no parameters\n"
          "params A@2#10002 [b@2 R:1:1@4]",
          "params A@2#10002 [b@2 R:1:1@4]"},
-        {'p', "h\n,0,Off,EN=0\n",
+        {'p', "h\n,0,Off,EN=0\nB,0,b,\n",
          "2:1:512 row without a parameter name +512\n"
-         "params",
-         SAME},
+         "params B@3#10003 [b@3]",
+         "2:1:512 row without a parameter name +512\n"
+         "params"},
         {'p', "h\n\"\",0,Off,EN=0\n",
          "2:1:512 row without a parameter name +512\n"
          "params",
@@ -248,10 +259,12 @@ TEST(DefinitionFiles, ProblemsWherePlacedAndWhatIsKept) {
          "params",
          "2:4:512 setting Fast\" is not of the form REGISTER=bits +512\n"
          "params"},
-        {'p', "h\nR,-4294967296,x,\n",
+        {'p', "h\nR,-4294967296,x,\nS,0,s,\nS,-1,t,\n",
          "2:2:256 choice_index out-of-order +256 +512\n"
-         "params",
-         SAME},
+         "4:2:256 choice_index out-of-order +256 +512\n"
+         "params S@3#10003 [s@3]",
+         "2:2:256 choice_index out-of-order +256 +512\n"
+         "params"},
         {'p',
          "h\nMODE,0,Off,EN=0\nMODE,1,On,EN=1,,SEL=01\n\"LEVEL\",0,Low,LVL=0000\nX,0\nY\n"
          "LEVEL,0,dup,\nM,1,a,\nM,2,b,\nZ,0,z,,EN=\r\nM,0,y,\nN,0,n,E=2\nN,1,m,\nK,0,k,E1\n"

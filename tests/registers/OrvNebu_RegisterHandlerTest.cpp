@@ -52,6 +52,7 @@ TEST_F(RegisterFileTest, PrintedImageNormalisesTheColumns) {
          "h\nA,1,0,0,0,,rw,,y\nB,2,0,0,0,,rw,,y\n"},
         {"h\nA,1,0,0,0,,rw,,y\nB,2,0,0,0,,rw,,y", "h\nA,1,0,0,0,,rw,,y\nB,2,0,0,0,,rw,,y\n"},
         {"A,1,0,0,0,,rw,,y\n", "A,1,0,0,0,,rw,,y\n"},  // the first line is never parsed
+        {"h\nA,9,0,0,0,,rw,,y\n", "h\nA,9,0,0,0,,rw,,y\n"},
         // Ctrl-Z, the end of a text file to old Windows programs, is a character like any other.
         {"h\nA,1,0,0,0,\x1a,rw,,y\nB,2,0,0,0,,rw,,y\n",
          "h\nA,1,0,0,0,\x1a,rw,,y\nB,2,0,0,0,,rw,,y\n"},
