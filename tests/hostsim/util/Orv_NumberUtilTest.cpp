@@ -44,7 +44,8 @@ std::string convert(const Conversion& c) {
         const std::string what = e.what();
         const std::string named = c.width == UINT32_MAX ? "4294967295" : "\"" + c.in + "\"";
         if (what.find(named) == std::string::npos) return "refusal without " + named + ": " + what;
-        return out == "kept" ? "!" + c.expected.substr(1) : "refusal wrote " + out;
+        if (what.find(c.expected.substr(1)) == std::string::npos) return "refusal: " + what;
+        return out == "kept" ? c.expected : "refusal wrote " + out;
     }
 }
 
