@@ -48,8 +48,8 @@ wine_probe() {
     skip "$loader cannot run a $arch Windows probe program ($(head -c 200 "$probe/hello.err" | tr '\n' ' '))"
 }
 
-# compare_console DIR LOADER: nebu.exe (loading orvnebu.dll beside it) runs the demo tour and
-# the valgrind session scripts; standard output, standard error and exit status must equal those
+# compare_console DIR LOADER: nebu.exe (loading orvnebu.dll beside it) runs the demo tour (the
+# transcripts already run under Wine as tests); standard output, standard error and exit status must equal those
 # of the Linux console (build/) line for line.
 compare_console() {
   local dir=$1 loader=$2 out="$1/console"
@@ -57,12 +57,11 @@ compare_console() {
   cmake --build "$root/build" -j "$jobs" --target nebu >/dev/null
   mkdir -p "$out"
   local name script args status=0
-  for script in "$root/scripts/demo.nebu" "$root"/tests/valgrind/*.nebu; do
+  for script in "$root/scripts/demo.nebu"; do
     script=${script#"$root"/}
     name=$(basename "$script" .nebu)
-    # As scripts/demo and 30-valgrind.sh run them (paths relative to the repository root).
+    # As scripts/demo runs it (paths relative to the repository root).
     args=("$script")
-    [ "$name" = demo ] || args=(--board boards/demo.json --data-dir data/ "$script")
     (cd "$root" && set +e
      build/bin/nebu "${args[@]}" </dev/null >"$out/$name.linux.out" 2>"$out/$name.linux.err"
      echo "exit status $?" >>"$out/$name.linux.out"

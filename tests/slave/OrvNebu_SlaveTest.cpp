@@ -39,12 +39,14 @@ TEST_F(SlaveChainTest, LinksThatLeadNowhereOrBack) {
     EXPECT_EQ(slaveAt(3)->getNextSlave(), nullptr) << "no slave object at the link";
     ASSERT_EQ(terminate(3), ORVNEBU_OK);
 
+    // Each with slaves one and two further on, which a wrong reading would reach.
     uint32_t index = 10;
     for (const char* text : {(const char*)nullptr, "", "0", "abc", " 0x2"}) {
         OrvNebu_Slave* s = addSlave(index, text);
+        addSlave(index + 1, nullptr);
         addSlave(index + 2, nullptr);
         EXPECT_EQ(s->getNextSlave(), nullptr) << (text ? text : "(absent)");
-        ++index;
+        index += 3;
     }
     OrvNebu_Slave* a = addSlave(3, "2");
     OrvNebu_Slave* b = addSlave(5, "-2");

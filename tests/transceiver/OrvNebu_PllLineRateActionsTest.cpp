@@ -202,7 +202,7 @@ TEST(PllLineRateChoiceString, FormatAndReading) {
     EXPECT_TRUE(OrvNebu_PllLineRateParamAction::readLineRateChoiceString(
         fb, ref, divsel, rate, "9.5e+2 FB=1, REF=1, DIVSEL=1"));
     EXPECT_EQ(950.0, rate);
-    for (const char* bad : {"foo", "100 FB=1, REF=2, DIVSEL=", "100 FB=x, REF=2, DIVSEL=3", "",
+    for (const char* bad : {"foo", "100 FB=1, REF=2, DIVSEL=", "100 FB=a, REF=2, DIVSEL=3", "",
                             "FB=1, REF=2, DIVSEL=3", ".e1 FB=1, REF=2, DIVSEL=3"}) {
         EXPECT_FALSE(
             OrvNebu_PllLineRateParamAction::readLineRateChoiceString(fb, ref, divsel, rate, bad));

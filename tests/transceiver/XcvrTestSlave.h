@@ -39,6 +39,9 @@ struct Choices {
     }
 };
 
+// Register reads of every memory slave, to see how far a question walks.
+inline uint32_t registerReads = 0;
+
 // A slave with registers in memory and a small parameter engine over its actions: requested
 // actions once each in priority order, one register read, then the actions' reads.
 class MemorySlave : public OrvRT::OrvNebu_DefaultSlave {
@@ -72,6 +75,7 @@ public:
     OrvNebu_ActionsMap& actions() { return actions_; }
 
     void getRegisters(uint32_t, const ORV_SLAVE_REF&, Orv_HashMapCStr* registers) override {
+        ++registerReads;
         for (auto& entry : *registers) {
             auto it = memory.find(entry.first);
             if (it == memory.end()) throw std::logic_error("no register " + entry.first);

@@ -7,6 +7,7 @@
 #include <cstdint>
 #include <filesystem>
 #include <fstream>
+#include <functional>
 #include <ostream>
 #include <sstream>
 #include <string>
@@ -31,9 +32,11 @@ namespace {
 const std::string HEADER = "# nebu";
 const std::string EXIT = "# exit ";
 const std::string COMMAND = "> ";
+const std::string PROGRAM = "$ nebu";
 
 struct Transcript {
     std::string path;
+    std::string folder;
     std::vector<std::string> lines;
     Options options;
 };
@@ -47,8 +50,15 @@ bool isComment(const std::string& line) { return line.empty() || line[0] == '#';
 
 bool isCommand(const std::string& line) { return line.compare(0, COMMAND.size(), COMMAND) == 0; }
 
+bool isProgram(const std::string& line) {
+    return line.compare(0, PROGRAM.size(), PROGRAM) == 0 &&
+           (line.size() == PROGRAM.size() || line[PROGRAM.size()] == ' ');
+}
+
 std::string escapeLine(const std::string& line) {
-    if (line.empty() || line[0] == '#' || line[0] == '>' || line[0] == '\\') return '\\' + line;
+    if (line.empty() || line[0] == '#' || line[0] == '>' || line[0] == '$' || line[0] == '\\') {
+        return '\\' + line;
+    }
     return line;
 }
 
@@ -88,61 +98,21 @@ Transcript readTranscript(const std::string& path) {
         throw UsageError(path + ":1: only console options belong on the first line");
     }
     const std::string folder = std::filesystem::path(path).parent_path().string();
+    t.folder = folder;
     t.options.boardFile = relativeTo(folder, t.options.boardFile);
     t.options.dataDir = relativeTo(folder, t.options.dataDir);
     t.options.pluginPath = relativeTo(folder, t.options.pluginPath);
     return t;
 }
 
-// The transcript as this run writes it: the first line, comments and commands where they
-// stand, each command followed by what it printed, then the exit status.
-std::vector<std::string> runTranscript(const Transcript& t, const std::string& exeDir) {
-    std::vector<size_t> commandLines;
-    for (size_t i = 1; i < t.lines.size(); ++i) {
-        if (isCommand(t.lines[i])) commandLines.push_back(i);
-    }
-    std::vector<std::string> printed(commandLines.size());
-    std::ostringstream output;
-    const int status = runConsole(t.options, exeDir, output, output, [&](Console& console) {
-        for (size_t c = 0; c < commandLines.size() && !console.quitRequested(); ++c) {
-            console.runLine(t.lines[commandLines[c]].substr(COMMAND.size()));
-            printed[c] = output.str();
-            output.str("");
-        }
-        // The next transcript of this process meets a fresh host, not the listeners of a
-        // plug-in that is about to be unloaded.
-        OrvSim::resetHost();
-    });
-
-    std::vector<std::string> actual = {t.lines[0]};
-    size_t c = 0;
-    for (size_t i = 1; i < t.lines.size(); ++i) {
-        if (isCommand(t.lines[i])) {
-            // The echo comes first, as the command stands; output lines are escaped.
-            const std::vector<std::string> lines = splitLines(printed[c++]);
-            for (size_t l = 0; l < lines.size(); ++l) {
-                const bool echo = l == 0 && lines[0] == t.lines[i];
-                actual.push_back(echo ? lines[l] : escapeLine(lines[l]));
-            }
-        } else if (isComment(t.lines[i]) && !(i + 1 == t.lines.size() && isExitLine(t.lines[i]))) {
-            actual.push_back(t.lines[i]);
-        }
-    }
-    for (const auto& line : splitLines(output.str())) actual.push_back(escapeLine(line));
-    actual.push_back(EXIT + std::to_string(status));
-    return actual;
-}
-
 #if defined(_WIN32)
-std::vector<std::string> runIsolated(const Transcript& t, const std::string& exeDir,
-                                     std::string& failure) {
+std::string isolated(const std::function<std::string()>& run, std::string& failure) {
     failure.clear();
-    return runTranscript(t, exeDir);
+    return run();
 }
 #else
 // In a child process: a host and a plug-in of its own, and a crash stays the child's.
-std::vector<std::string> runIsolated(const Transcript& t, const std::string& exeDir,
-                                     std::string& failure) {
+std::string isolated(const std::function<std::string()>& run, std::string& failure) {
     failure.clear();
     int fds[2];
     if (pipe(fds) != 0) throw UsageError("cannot create a pipe");
@@ -150,8 +120,7 @@ std::vector<std::string> runIsolated(const Transcript& t, const std::string& exe
     if (pid < 0) throw UsageError("cannot start a process");
     if (pid == 0) {
         close(fds[0]);
-        std::string text;
-        for (const auto& line : runTranscript(t, exeDir)) text += line + '\n';
+        const std::string text = run();
         for (size_t done = 0; done < text.size();) {
             const ssize_t n = write(fds[1], text.data() + done, text.size() - done);
             if (n <= 0) _exit(3);
@@ -172,9 +141,91 @@ std::vector<std::string> runIsolated(const Transcript& t, const std::string& exe
     } else if (!WIFEXITED(wait) || WEXITSTATUS(wait) != 0) {
         failure = "the console did not finish";
     }
-    return splitLines(text);
+    return text;
 }
 #endif
+
+// A "$ nebu ARGS" line: the program run with those arguments in the transcript's folder, with
+// nothing on its standard input; what it printed, then "[exit N]" unless N is 0.
+std::string runProgram(const Transcript& t, const std::string& line) {
+    std::vector<std::string> args = {"nebu"};
+    for (auto& word : splitWords(line.substr(PROGRAM.size()))) args.push_back(word);
+    std::vector<char*> argv;
+    for (auto& arg : args) argv.push_back(arg.data());
+    argv.push_back(nullptr);
+    const std::filesystem::path before = std::filesystem::current_path();
+    if (!t.folder.empty()) std::filesystem::current_path(t.folder);
+    std::istringstream in;
+    std::ostringstream output;
+    const int status =
+        runNebu(static_cast<int>(args.size()), argv.data(), in, output, output, false);
+    std::filesystem::current_path(before);
+    OrvSim::resetHost();
+    return output.str() + (status == 0 ? "" : "[exit " + std::to_string(status) + "]\n");
+}
+
+// The transcript as this run writes it: the first line, comments and commands where they
+// stand, each command followed by what it printed, then the exit status.
+std::vector<std::string> runTranscript(const Transcript& t, const std::string& exeDir) {
+    // Program runs come first: each is a process of its own (on POSIX), done before this
+    // console starts.
+    std::vector<std::string> programOutput(t.lines.size());
+    for (size_t i = 1; i < t.lines.size(); ++i) {
+        if (!isProgram(t.lines[i])) continue;
+        std::string failure;
+        programOutput[i] = isolated([&] { return runProgram(t, t.lines[i]); }, failure);
+        if (!failure.empty()) programOutput[i] += "[" + failure + "]\n";
+    }
+    std::vector<size_t> commandLines;
+    for (size_t i = 1; i < t.lines.size(); ++i) {
+        if (isCommand(t.lines[i])) commandLines.push_back(i);
+    }
+    std::vector<std::string> printed(commandLines.size());
+    std::ostringstream output;
+    const int status = runConsole(t.options, exeDir, output, output, [&](Console& console) {
+        for (size_t c = 0; c < commandLines.size() && !console.quitRequested(); ++c) {
+            console.runLine(t.lines[commandLines[c]].substr(COMMAND.size()));
+            printed[c] = output.str();
+            output.str("");
+        }
+        // The next transcript of this process meets a fresh host, not the listeners of a
+        // plug-in that is about to be unloaded.
+        OrvSim::resetHost();
+    });
+
+    std::vector<std::string> actual = {t.lines[0]};
+    size_t c = 0;
+    for (size_t i = 1; i < t.lines.size(); ++i) {
+        if (isProgram(t.lines[i])) {
+            actual.push_back(t.lines[i]);
+            for (const auto& line : splitLines(programOutput[i]))
+                actual.push_back(escapeLine(line));
+        } else if (isCommand(t.lines[i])) {
+            // The echo comes first, as the command stands; output lines are escaped.
+            const std::vector<std::string> lines = splitLines(printed[c++]);
+            for (size_t l = 0; l < lines.size(); ++l) {
+                const bool echo = l == 0 && lines[0] == t.lines[i];
+                actual.push_back(echo ? lines[l] : escapeLine(lines[l]));
+            }
+        } else if (isComment(t.lines[i]) && !(i + 1 == t.lines.size() && isExitLine(t.lines[i]))) {
+            actual.push_back(t.lines[i]);
+        }
+    }
+    for (const auto& line : splitLines(output.str())) actual.push_back(escapeLine(line));
+    actual.push_back(EXIT + std::to_string(status));
+    return actual;
+}
+
+std::vector<std::string> runIsolated(const Transcript& t, const std::string& exeDir,
+                                     std::string& failure) {
+    return splitLines(isolated(
+        [&] {
+            std::string text;
+            for (const auto& line : runTranscript(t, exeDir)) text += line + '\n';
+            return text;
+        },
+        failure));
+}
 
 // Longest common subsequence of the lines between the common head and tail, as a list of
 // edits: ' ' kept, '-' only expected, '+' only actual, with the line indices.

@@ -64,8 +64,4 @@ TEST_F(DataDirTest, DataDirEndsInASeparatorAndIsForgottenByAFreshHost) {
     EXPECT_EQ(Orv_Util::getVanduDataDirPath(), "./");
 }
 
-TEST_F(DataDirTest, TheFixtureSetsTheTestDataDirectory) {
-    EXPECT_EQ(Orv_Util::getVanduDataDirPath(), std::string(NEBU_TEST_DATA_DIR) + "/");
-}
-
 }  // namespace

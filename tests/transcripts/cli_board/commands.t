@@ -1,0 +1,2 @@
+# nebu -e stats
+# exit 0

@@ -1,0 +1,123 @@
+# nebu
+# The program's options: start-up mistakes stop it with one line and exit 2, before any board
+# or plug-in is touched; the demo board, data and plug-in are found beside the program.
+$ nebu -e stats
+\> stats
+stats commands=0 writeBits=0 readBits=0 flushes=0 statusReads=0 roundTrips=0 cableUs=0
+$ nebu --board=../../boards/demo.json --board cli_board/memory.json --data-dir=../../data --session 0x10 --trace -e "peek 0 1 0 0x10"
+\> peek 0 1 0 0x10
+peek=0x1234
+$ nebu --tck-mhz 12.5 --round-trip-us=0 -e "singleSlaveRead 0 1 0 3" -e stats
+\> singleSlaveRead 0 1 0 3
+rc=0x00000000
+buffer=0x1234
+status=0
+\> stats
+stats commands=12 writeBits=86 readBits=37 flushes=0 statusReads=4 roundTrips=9 cableUs=10
+$ nebu --tck-mhz=1e1 --round-trip-us .5 -e "getSlaveCount 0 1" -e stats
+\> getSlaveCount 0 1
+rc=0x00000000
+count=8
+\> stats
+stats commands=8 writeBits=38 readBits=11 flushes=0 statusReads=4 roundTrips=7 cableUs=8
+$ nebu --help
+usage: nebu [--board FILE] [--data-dir DIR] [--session N] [--trace] [--plugin PATH] [--tck-mhz F]
+            [--round-trip-us R] [-e COMMAND]... [SCRIPT]
+  --board FILE     virtual board (JSON); default: the demo board
+  --data-dir DIR   host data directory; default: the demo data directory
+  --session N      session handle of the first command (default 1)
+  --trace          print every JTAG operation
+  --plugin PATH    plug-in library to load; default: the one built beside nebu
+  --tck-mhz F      cable test clock in MHz for the stats estimate (default 30)
+  --round-trip-us R  cost of one cable round trip in microseconds (default 125)
+  -e COMMAND       run one command (repeatable); SCRIPT runs first when given
+  SCRIPT           file of commands; without -e and SCRIPT, standard input
+       nebu lint [DATA_DIR]   check a data directory (default: the demo data)
+       nebu check [--update] TRANSCRIPT...   run transcripts of sessions again
+       nebu doc [DATA_DIR] -o DIR   write its register-map pages into DIR
+Type 'help' at the prompt (or -e help) for the commands.
+$ nebu --bogus -e stats
+nebu: unknown option '--bogus'
+[exit 2]
+$ nebu -x
+nebu: unknown option '-x'
+[exit 2]
+$ nebu --board
+nebu: option --board needs an argument
+[exit 2]
+$ nebu -e
+nebu: option -e needs an argument
+[exit 2]
+$ nebu --session 1x
+nebu: bad number '1x' for --session
+[exit 2]
+$ nebu --session 4294967296
+nebu: bad number '4294967296' for --session
+[exit 2]
+$ nebu --session
+nebu: option --session needs an argument
+[exit 2]
+$ nebu --trace=yes
+nebu: option --trace takes no argument
+[exit 2]
+$ nebu a.nebu b.nebu
+nebu: more than one script: 'a.nebu', 'b.nebu'
+[exit 2]
+$ nebu --board=
+nebu: option --board needs a file name
+[exit 2]
+$ nebu -- a b
+nebu: more than one script: 'a', 'b'
+[exit 2]
+$ nebu -- -x
+nebu: cannot open script -x
+[exit 2]
+$ nebu cli_board/missing.nebu
+nebu: cannot open script cli_board/missing.nebu
+[exit 2]
+$ nebu --tck-mhz 0
+nebu: --tck-mhz must be above 0, not 0
+[exit 2]
+$ nebu --tck-mhz 0.0e5
+nebu: --tck-mhz must be above 0, not 0.0e5
+[exit 2]
+$ nebu --tck-mhz 1e-999
+nebu: --tck-mhz must be above 0, not 1e-999
+[exit 2]
+$ nebu --tck-mhz -3
+nebu: bad number '-3' for --tck-mhz
+[exit 2]
+$ nebu --tck-mhz 1e999
+nebu: bad number '1e999' for --tck-mhz
+[exit 2]
+$ nebu --tck-mhz inf
+nebu: bad number 'inf' for --tck-mhz
+[exit 2]
+$ nebu --tck-mhz nan
+nebu: bad number 'nan' for --tck-mhz
+[exit 2]
+$ nebu --tck-mhz 0x10
+nebu: bad number '0x10' for --tck-mhz
+[exit 2]
+$ nebu --tck-mhz " 30"
+nebu: bad number ' 30' for --tck-mhz
+[exit 2]
+$ nebu --tck-mhz 30MHz
+nebu: bad number '30MHz' for --tck-mhz
+[exit 2]
+$ nebu --tck-mhz=
+nebu: bad number '' for --tck-mhz
+[exit 2]
+$ nebu --round-trip-us .
+nebu: bad number '.' for --round-trip-us
+[exit 2]
+$ nebu --round-trip-us 1.2.3
+nebu: bad number '1.2.3' for --round-trip-us
+[exit 2]
+$ nebu --round-trip-us -0
+nebu: bad number '-0' for --round-trip-us
+[exit 2]
+$ nebu --round-trip-us
+nebu: option --round-trip-us needs an argument
+[exit 2]
+# exit 0
