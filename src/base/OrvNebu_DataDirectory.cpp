@@ -158,7 +158,9 @@ void OrvNebu_DataDirectory::checkTransceiverNeeds(const Row& row,
         const std::string what =
             "slave type " + typeText(row.slaveType) + " (" + info.family + " transceiver)";
         if (row.parameters.empty()) {
-            add(row, what + " has no parameter file, so none of its computed parameters");
+            add(row,
+                what +
+                    " has no parameter file, so its slaves have none of their computed parameters");
         }
         std::set<std::string> registersSeen, paramsSeen;
         for (const Classes::ComputedAction& action : info.actions) {
