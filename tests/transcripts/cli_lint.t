@@ -31,7 +31,7 @@ cli_lint/many/orvnebu_directory.csv:6: slave type 0x11: driver versions 1 to 1 a
 cli_lint/many/orvnebu_directory.csv:7: slave type 0x31: driver versions 5 to 4 is an empty range
 cli_lint/many/orvnebu_directory.csv:8: slave type 0x32 has no register file: its slaves cannot be created
 cli_lint/many/orvnebu_directory.csv:9: line of 2 fields is never used: the key columns need 3
-cli_lint/many/orvnebu_directory.csv:12: slave type 0x45 (R3Qrb transceiver) has no parameter file, so none of its computed parameters
+cli_lint/many/orvnebu_directory.csv:12: slave type 0x45 (R3Qrb transceiver) has no parameter file, so its slaves have none of their computed parameters
 cli_lint/many/orvnebu_directory.csv:12: slave type 0x45 (R3Qrb transceiver) needs register RXUSERCLKOUT_FREQ_CNT2, which cli_lint/many/f_regs.csv lacks
 cli_lint/many/orvnebu_directory.csv:13: slave type 0x42 (R2Qra transceiver) needs parameter pll_divsel_ref, which cli_lint/many/f_params.csv lacks
 cli_lint/many/orvnebu_directory.csv:28: slave type 0xa0: driver versions 5 to 4 is an empty range

@@ -4,3 +4,18 @@
 # parameter file two rows share (its problems shown once), a transceiver row without files, a
 # full-width register over bit 0, two high halves, an excluded line without a name.
 $ nebu lint lint_edges
+lint_edges/g_params.csv:3: parameter r, choice wide: value 0x10 of register R needs 5 bits, the register has 4
+lint_edges/g_params.csv:4: parameter s, choice a: value 0xA of register S needs 4 bits, the register has 3
+lint_edges/g_params.csv:5: parameter s, choice f: value 0xF of register S needs 4 bits, the register has 3
+lint_edges/g_params.csv:6: parameter s, choice e: value 0xE of register S needs 4 bits, the register has 3
+lint_edges/g_regs.csv:4: register A: bits 0 to 31 of word 0x2 lie beyond the 16-bit bus word
+lint_edges/g_regs.csv:5: register B overlaps register A (line 4) in bit 0 of word 0x2
+lint_edges/g_regs.csv:6: register H: bits 16 to 31 of word 0x3 lie beyond the 16-bit bus word
+lint_edges/g_regs.csv:7: register K: bits 16 to 31 of word 0x3 lie beyond the 16-bit bus word
+lint_edges/g_regs.csv:7: register K overlaps register H (line 6) in bits 16 to 31 of word 0x3
+lint_edges/orvnebu_directory.csv:4: slave type 0x42 has no register file: its slaves cannot be created
+lint_edges/orvnebu_directory.csv:4: slave type 0x42 (R2Qra transceiver) has no parameter file, so its slaves have none of their computed parameters
+lint_edges/orvnebu_directory.csv:5: Unable to open OrvNebu parameter file: lint_edges/ nosuch.csv
+lint lint_edges/: 4 directory lines, 2 definition files, 12 problems
+[exit 1]
+# exit 0
