@@ -5,7 +5,8 @@
 # full-width register over bit 0, two high halves, an excluded line without a name or at the end
 # of the bus, unnamed slices on one word, a first line that only looks like a register line, a
 # driver version 0 that makes no transceiver; a blank before a name hinted at only when the name
-# without it is a file. Last, a header without its minimum-version column.
+# without it is a file. Then a header without its minimum-version column, and the print of a
+# parameter row with settings of two widths (one empty) and of a register at address a.
 $ nebu lint lint_edges
 lint_edges/g_params.csv:3: parameter r, choice wide: value 0x10 of register R needs 5 bits, the register has 4
 lint_edges/g_params.csv:4: parameter s, choice a: value 0xA of register S needs 4 bits, the register has 3
@@ -31,4 +32,12 @@ $ nebu lint lint_nomin
 lint_nomin/orvnebu_directory.csv:1: Unable to parse header of CSV file: lint_nomin/orvnebu_directory.csv: it has no orv_drv_ver_min column
 lint lint_nomin/: 0 directory lines, 0 definition files, 1 problem
 [exit 1]
+$ nebu -e "printParameterFile lint_edges/print_params.csv" -e "printRegisterFile lint_edges/print_regs.csv"
+\> printParameterFile lint_edges/print_params.csv
+h
+p,0,a,R1=1,R2=101
+p,1,b,A=1,BB=
+\> printRegisterFile lint_edges/print_regs.csv
+h
+A,0a,0,3,0,x,rw,,y
 # exit 0
