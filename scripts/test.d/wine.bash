@@ -48,39 +48,31 @@ wine_probe() {
     skip "$loader cannot run a $arch Windows probe program ($(head -c 200 "$probe/hello.err" | tr '\n' ' '))"
 }
 
-# compare_console DIR LOADER: nebu.exe (loading orvnebu.dll beside it) runs the demo tour (the
-# transcripts already run under Wine as tests); standard output, standard error and exit status must equal those
-# of the Linux console (build/) line for line.
+# compare_console DIR LOADER: nebu.exe (loading orvnebu.dll beside it) runs the demo tour as
+# scripts/demo does (the transcripts already run under Wine as tests); standard output, standard
+# error and exit status must equal those of the Linux console (build/) line for line.
 compare_console() {
-  local dir=$1 loader=$2 out="$1/console"
+  local dir=$1 loader=$2 out="$1/console" script=scripts/demo.nebu name=demo status=0
   [ -f "$root/build/CMakeCache.txt" ] || configure "$root/build"
   cmake --build "$root/build" -j "$jobs" --target nebu >/dev/null
   mkdir -p "$out"
-  local name script args status=0
-  for script in "$root/scripts/demo.nebu"; do
-    script=${script#"$root"/}
-    name=$(basename "$script" .nebu)
-    # As scripts/demo runs it (paths relative to the repository root).
-    args=("$script")
-    (cd "$root" && set +e
-     build/bin/nebu "${args[@]}" </dev/null >"$out/$name.linux.out" 2>"$out/$name.linux.err"
-     echo "exit status $?" >>"$out/$name.linux.out"
-     "$root/scripts/wine-run" "$dir/wineprefix" "$loader" "$dir/bin/nebu.exe" "${args[@]}" \
-       </dev/null >"$out/$name.windows.out" 2>"$out/$name.windows.err"
-     echo "exit status $?" >>"$out/$name.windows.out")
-    local same=1
-    for stream in out err; do
-      if ! diff -u "$out/$name.linux.$stream" "$out/$name.windows.$stream" \
-        >"$out/$name.$stream.diff"; then
-        head -40 "$out/$name.$stream.diff" >&2
-        echo "$pass: nebu.exe differs from the Linux console on $script" \
-          "(std$stream, ${out#"$root"/}/$name.$stream.diff)" >&2
-        same=0 status=1
-      fi
-    done
-    [ $same -eq 0 ] ||
-      echo "$pass: nebu.exe $script: $(wc -l <"$out/$name.windows.out") lines, the same as on Linux"
+  (cd "$root" && set +e
+   build/bin/nebu "$script" </dev/null >"$out/$name.linux.out" 2>"$out/$name.linux.err"
+   echo "exit status $?" >>"$out/$name.linux.out"
+   "$root/scripts/wine-run" "$dir/wineprefix" "$loader" "$dir/bin/nebu.exe" "$script" \
+     </dev/null >"$out/$name.windows.out" 2>"$out/$name.windows.err"
+   echo "exit status $?" >>"$out/$name.windows.out")
+  for stream in out err; do
+    if ! diff -u "$out/$name.linux.$stream" "$out/$name.windows.$stream" \
+      >"$out/$name.$stream.diff"; then
+      head -40 "$out/$name.$stream.diff" >&2
+      echo "$pass: nebu.exe differs from the Linux console on $script" \
+        "(std$stream, ${out#"$root"/}/$name.$stream.diff)" >&2
+      status=1
+    fi
   done
+  [ $status -ne 0 ] ||
+    echo "$pass: nebu.exe $script: $(wc -l <"$out/$name.windows.out") lines, the same as on Linux"
   return $status
 }
 
