@@ -39,23 +39,11 @@ Type 'help' at the prompt (or -e help) for the commands.
 $ nebu --bogus -e stats
 nebu: unknown option '--bogus'
 [exit 2]
-$ nebu -x
-nebu: unknown option '-x'
-[exit 2]
 $ nebu --board
 nebu: option --board needs an argument
 [exit 2]
-$ nebu -e
-nebu: option -e needs an argument
-[exit 2]
 $ nebu --session 1x
 nebu: bad number '1x' for --session
-[exit 2]
-$ nebu --session 4294967296
-nebu: bad number '4294967296' for --session
-[exit 2]
-$ nebu --session
-nebu: option --session needs an argument
 [exit 2]
 $ nebu --trace=yes
 nebu: option --trace takes no argument
@@ -66,9 +54,6 @@ nebu: more than one script: 'a.nebu', 'b.nebu'
 $ nebu --board=
 nebu: option --board needs a file name
 [exit 2]
-$ nebu -- a b
-nebu: more than one script: 'a', 'b'
-[exit 2]
 $ nebu -- -x
 nebu: cannot open script -x
 [exit 2]
@@ -78,29 +63,14 @@ nebu: cannot open script cli_board/missing.nebu
 $ nebu --tck-mhz 0
 nebu: --tck-mhz must be above 0, not 0
 [exit 2]
-$ nebu --tck-mhz 0.0e5
-nebu: --tck-mhz must be above 0, not 0.0e5
-[exit 2]
 $ nebu --tck-mhz 1e-999
 nebu: --tck-mhz must be above 0, not 1e-999
 [exit 2]
 $ nebu --tck-mhz -3
 nebu: bad number '-3' for --tck-mhz
 [exit 2]
-$ nebu --tck-mhz 1e999
-nebu: bad number '1e999' for --tck-mhz
-[exit 2]
 $ nebu --tck-mhz inf
 nebu: bad number 'inf' for --tck-mhz
-[exit 2]
-$ nebu --tck-mhz nan
-nebu: bad number 'nan' for --tck-mhz
-[exit 2]
-$ nebu --tck-mhz 0x10
-nebu: bad number '0x10' for --tck-mhz
-[exit 2]
-$ nebu --tck-mhz " 30"
-nebu: bad number ' 30' for --tck-mhz
 [exit 2]
 $ nebu --tck-mhz 30MHz
 nebu: bad number '30MHz' for --tck-mhz
@@ -108,14 +78,8 @@ nebu: bad number '30MHz' for --tck-mhz
 $ nebu --tck-mhz=
 nebu: bad number '' for --tck-mhz
 [exit 2]
-$ nebu --round-trip-us .
-nebu: bad number '.' for --round-trip-us
-[exit 2]
 $ nebu --round-trip-us 1.2.3
 nebu: bad number '1.2.3' for --round-trip-us
-[exit 2]
-$ nebu --round-trip-us -0
-nebu: bad number '-0' for --round-trip-us
 [exit 2]
 $ nebu --round-trip-us
 nebu: option --round-trip-us needs an argument

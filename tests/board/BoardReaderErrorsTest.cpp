@@ -1,12 +1,13 @@
-// The board file reader: number forms, defaults, and one clear error per malformed file.
+// One clear error per malformed board file: the file, the place in it and the problem.
 #include <gtest/gtest.h>
 
-#include "board/BoardBus.h"
+#include <string>
+#include <vector>
 
-using boardtest::BoardBus;
+#include "hostsim/board/Board.h"
+
 using OrvSim::Board;
 using OrvSim::BoardError;
-
 namespace {
 
 std::string errorOf(const std::string& json, const std::string& name = "boards/x.json") {
@@ -22,50 +23,6 @@ std::string errorOf(const std::string& json, const std::string& name = "boards/x
 std::string withMaster(const std::string& master) {
     return R"({"devices":[{"chains":{"1":{"cores":[{"type":3},{"type":14,"master":{)" + master +
            "}}]}}}]}";
-}
-
-class BoardReaderTest : public BoardBus {};
-
-TEST_F(BoardReaderTest, NumbersAsJsonNumbersOrDecimalOrHexText) {
-    loadMaster(R"("slaveCount": "0x3", "periodInt": "1000", "periodFrc": 0, "resetPolls": "-1",
-                  "clockPolls": "0X2", "busErrors": "2",
-                  "slaves": {"0x2": {"slaveType": "0xabCD", "driverVersion": "65535",
-                                     "memory": {"16": [7, "0x8", "9"], "0x1FFFF": "0xffff"}}})");
-    EXPECT_EQ(slaveCount, 3u);
-    EXPECT_EQ(board->peek(DEV, CHAIN, 2, 0x1FFF0), 0xABCD);
-    EXPECT_EQ(board->peek(DEV, CHAIN, 2, 0x1FFF1), 0xFFFF);
-    EXPECT_EQ(board->peek(DEV, CHAIN, 2, 16), 7);
-    EXPECT_EQ(board->peek(DEV, CHAIN, 2, 17), 8);
-    EXPECT_EQ(board->peek(DEV, CHAIN, 2, 18), 9);
-    EXPECT_EQ(board->peek(DEV, CHAIN, 2, 0x1FFFF), 0xFFFF);
-    EXPECT_EQ(busErrors(), 2u);
-    busReset();
-    for (int i = 0; i < 20; ++i)
-        ASSERT_EQ(masterStatus(), 0u) << "resetPolls \"-1\" never completes";
-
-    std::vector<uint8_t> bits(20);
-    uint32_t info[5];
-    ASSERT_TRUE(board->coreStatus(DEV, CHAIN, 1, info, bits.data(), 160));
-    EXPECT_EQ(
-        (boardtest::valueOf(std::vector<uint8_t>(bits.begin() + 8, bits.end()), 32) >> 4) & 0x3FF,
-        1000u);
-}
-
-TEST_F(BoardReaderTest, DefaultsOfAnEmptyMaster) {
-    loadMaster("");
-    EXPECT_EQ(slaveCount, 0u);
-    EXPECT_EQ(busErrors(), 0u);
-    // resetPolls and clockPolls 1, clock running, no clock reset in the status.
-    write(1, 0x1, 2);
-    write(1, 0x0, 2);
-    EXPECT_EQ(masterStatus(), 2u);
-    write(7, 1, 4);
-    write(7, 0, 4);
-    EXPECT_EQ(read(7, 3), 2u);
-    std::vector<uint8_t> bits(20, 0xFF);
-    uint32_t info[5];
-    ASSERT_TRUE(board->coreStatus(DEV, CHAIN, 1, info, bits.data(), 160));
-    for (uint8_t b : bits) EXPECT_EQ(b, 0u);
 }
 
 TEST(BoardReaderErrors, MessagesNameTheFileThePlaceAndTheProblem) {
