@@ -1,17 +1,7 @@
 // The built nebu program where a transcript cannot take it: another library as the plug-in, a
-// terminal, a path of the platform's own form, and `nebu check --update` rewriting a file.
+// path of the platform's own form, and `nebu check --update` rewriting a file.
 #include <gtest/gtest.h>
 
-#if !defined(_WIN32)
-#include <fcntl.h>
-#include <poll.h>
-#include <pty.h>
-#include <spawn.h>
-#include <sys/wait.h>
-#include <unistd.h>
-#endif
-
-#include <cstdio>
 #include <filesystem>
 #include <fstream>
 #include <string>
@@ -86,60 +76,6 @@ TEST_F(NebuProgramTest, FunctionsThePluginDoesNotExportAreUnknownCommands) {
                   "OrvNebu_getSlaveCount)"}));
 }
 
-#if !defined(_WIN32)
-// A terminal of its own for the console is a pseudo-terminal, which Windows does not have.
-TEST_F(NebuProgramTest, TerminalInputGetsAPrompt) {
-    int master = -1;
-    int terminal = -1;
-    ASSERT_EQ(openpty(&master, &terminal, nullptr, nullptr, nullptr), 0);
-    const std::string err = (dir_ / "stderr.txt").string();
-    posix_spawn_file_actions_t actions;
-    posix_spawn_file_actions_init(&actions);
-    posix_spawn_file_actions_adddup2(&actions, terminal, 0);
-    posix_spawn_file_actions_adddup2(&actions, terminal, 1);
-    posix_spawn_file_actions_addopen(&actions, 2, err.c_str(), O_WRONLY | O_CREAT | O_TRUNC, 0600);
-    posix_spawn_file_actions_addclose(&actions, master);
-    posix_spawn_file_actions_addclose(&actions, terminal);
-    std::vector<std::string> args = {NEBU_CONSOLE_PATH, "--board", board_, "--plugin",
-                                     NEBU_PLUGIN_PATH};
-    std::vector<char*> argv;
-    for (auto& arg : args) argv.push_back(arg.data());
-    argv.push_back(nullptr);
-    pid_t pid = -1;
-    const int spawned =
-        posix_spawn(&pid, NEBU_CONSOLE_PATH, &actions, nullptr, argv.data(), environ);
-    posix_spawn_file_actions_destroy(&actions);
-    close(terminal);
-    ASSERT_EQ(spawned, 0);
-
-    // A command, then end-of-file (Ctrl-D at the start of a line).
-    const std::string typed = "peek 0 1 0 0x10\n\x04";
-    ASSERT_EQ(::write(master, typed.data(), typed.size()), static_cast<ssize_t>(typed.size()));
-    std::string screen;
-    for (;;) {
-        pollfd ready{master, POLLIN, 0};
-        if (poll(&ready, 1, 10000) <= 0) break;  // only a guard against a hang
-        char buffer[512];
-        const ssize_t n = read(master, buffer, sizeof buffer);
-        if (n <= 0) break;  // the console has exited and closed the terminal
-        screen.append(buffer, static_cast<size_t>(n));
-    }
-    close(master);
-    int wait = 0;
-    ASSERT_EQ(waitpid(pid, &wait, 0), pid);
-    EXPECT_TRUE(WIFEXITED(wait) && WEXITSTATUS(wait) == 0) << wait;
-    EXPECT_EQ(readFile(err), "");
-    // The terminal shows the prompt, the typed line, the echo and the result; a prompt again
-    // before end-of-file.
-    const size_t prompt = screen.find("nebu> ");
-    const size_t result = screen.find("> peek 0 1 0 0x10\r\npeek=0x1234\r\n");
-    ASSERT_NE(prompt, std::string::npos) << screen;
-    ASSERT_NE(result, std::string::npos) << screen;
-    EXPECT_LT(prompt, result);
-    EXPECT_NE(screen.find("nebu> ", result), std::string::npos) << screen;
-}
-
-#endif
 
 // '\' on Windows: the platform's separator at the end gets no second one.
 TEST_F(NebuProgramTest, LintTakesTheDataDirectoryEndingInTheSeparator) {
