@@ -51,8 +51,12 @@ TEST(ClockFreqActions, OutputsFromCounterWindowAndSystemClock) {
         {R2, false, "rxusrclk21_freq", "RXUSRCLK2", "1", "64", "3", "-50", "-6666", 2},
         {R2, false, "txusrclk0_freq", "TXUSRCLK", "0", "2", "1", "4611686018427387904",
          "!Cannot calculate txusrclk0_freq, since the result does not fit in 64 bits.", 2},
-        // A counter at the top of 64 bits must not wrap to 1 when 2 is added.
-        {M3, false, "txoutclk1_freq", "TXOUTCLK", "1", "FFFFFFFFFFFFFFFF", "4", "1",
+        {R2, false, "txusrclk0_freq", "TXUSRCLK", "0", "1", "1", "3000000000000000000",
+         "!Cannot calculate txusrclk0_freq, since the result does not fit in 64 bits.", 2},
+        {R2, false, "txusrclk0_freq", "TXUSRCLK", "0", "1", "2", "4611686018427387903",
+         "9223372036854775806", 2},
+        // A counter at the top of 64 bits must not wrap to 0 when 2 is added.
+        {M3, false, "txoutclk1_freq", "TXOUTCLK", "1", "FFFFFFFFFFFFFFFE", "4", "1",
          "18446744073709551616.000000", 2},
     };
     for (const auto& row : rows) {

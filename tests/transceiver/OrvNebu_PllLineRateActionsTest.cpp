@@ -32,6 +32,7 @@ TEST(PllLineRateChoiceString, FormatAndReading) {
         {"100 FB=a, REF=2, DIVSEL=3", false, 0, 0, 0, 0},
         {"FB=1, REF=2, DIVSEL=3", false, 0, 0, 0, 0},
         {".e1 FB=1, REF=2, DIVSEL=3", false, 0, 0, 0, 0},
+        {"1e FB=1, REF=2, DIVSEL=3", false, 0, 0, 0, 0},
     };
     for (const auto& row : rows) {
         SCOPED_TRACE(row.text);

@@ -34,10 +34,10 @@ choice=768.000 FB=5, REF=2, DIVSEL=4
 rc=0x00000000
 line_rate0=1000.000 FB=2, REF=1, DIVSEL=2
 refclk_freq0=125
-> getParameters 0 2 0 line_rate0 refclk_freq0=1e300
+> getParameters 0 2 0 line_rate0 refclk_freq0=2e68
 rc=0x00000000
-line_rate0=8000000000000000420038082041635361989635748648865273239326832924094419663911265566290971000643582912349635550663071025415540185882883444605158337478293655862787097607412606429902641870358304720474951625879766399560648952311741127040597221942241139956634070310560454742704925355777571094923675204321280.000 FB=2, REF=1, DIVSEL=2
-refclk_freq0=1e300
+line_rate0=1599999999999999924488355602210668907060020661645787176486745975816192.000 FB=2, REF=1, DIVSEL=2
+refclk_freq0=2e68
 > poke 0 2 0 0x04 0x04B1
 > getParameters 0 2 0 line_rate0 refclk_freq0=125
 rc=0x00000000
@@ -47,10 +47,10 @@ refclk_freq0=125
 message 256: Cannot calculate line rate choice, since refclk_freq0 has not been passed in to getParam() function.
 rc=0x80000000
 line_rate0=
-> getParameters 0 2 0 txusrclk0_freq sysclk_freq=1e60
+> getParameters 0 2 0 txusrclk0_freq sysclk_freq=1e56
 rc=0x00000000
-sysclk_freq=1e60
-txusrclk0_freq=4999999999999999033311830132390153805675240330319482174046208.000000
+sysclk_freq=1e56
+txusrclk0_freq=500000000000000024173346057776829528764197422945257127936.000000
 # Setting at width 16 (no multiple of 10: the flagged clocks run at rate / 8) writes both output
 # dividers and every window.
 > poke 0 2 0 0x04 0x0280
@@ -59,8 +59,8 @@ rc=0x00000000
 > peek 0 2 0 0x04 36
 peek=0x0251 0x035C 0x0000 0x0000 0x0000 0x0000 0x0000 0x0000 0x0000 0x0000 0x0000 0x0000 0xDABE 0x3816 0xC7FD 0xFFFF 0xDABE 0x3816 0xC7FD 0xFFFF 0xDABE 0x3816 0xC7FD 0xFFFF 0x9FFD 0x702D 0x63FD 0xFFFF 0xDABE 0x3816 0xC7FD 0xFFFF 0x9FFD 0x702D 0x63FD 0xFFFF
 # Refused settings write nothing.
-> setParameters 0 2 0 "line_rate0=1e20 FB=2, REF=1, DIVSEL=1" sysclk_freq=50
-message 256: Unable to set line rate from string '1e20 FB=2, REF=1, DIVSEL=1'
+> setParameters 0 2 0 "line_rate0=18446744073709551616 FB=2, REF=1, DIVSEL=1" sysclk_freq=50
+message 256: Unable to set line rate from string '18446744073709551616 FB=2, REF=1, DIVSEL=1'
 rc=0x80000000
 > setParameters 0 2 0 "line_rate0=foo" sysclk_freq=50
 message 256: Unable to set line rate from string 'foo'
@@ -70,9 +70,6 @@ message 256: Cannot calculate new line rate tune values, since sysclk_freq has n
 rc=0x80000000
 > setParameters 0 2 0 "line_rate0=2500.000 FB=9, REF=1, DIVSEL=1" sysclk_freq=50
 message 256: Setting Parameter 'pll_divsel_fb_0' to value '9' is not a valid choice.
-rc=0x80000000
-> setParameters 0 2 0 "line_rate0=2500.000 FB=99999999999999999999999, REF=1, DIVSEL=1" sysclk_freq=50
-message 256: Setting Parameter 'pll_divsel_fb_0' to value '18446744073709551615' is not a valid choice.
 rc=0x80000000
 > poke 0 2 0 0x04 0x0780
 > setParameters 0 2 0 "line_rate0=2500.000 FB=2, REF=1, DIVSEL=1" sysclk_freq=50
@@ -103,23 +100,39 @@ refclk_freq=125
 rc=0x00000000
 > peek 0 2 4 0x04 24
 peek=0x4003 0x000B 0x0000 0x0000 0x0000 0x0000 0x0000 0x0000 0x0000 0x0000 0x0000 0x0000 0x9FFD 0x48EA 0x9FFD 0x91D5 0x9FFD 0x48EA 0x9FFD 0x91D5 0x9FFD 0x91D5 0x9FFD 0x91D5
-# R2Qra: whole numbers, 156.25 counts as 156; only the channel asked for is given.
+# Every parameter: the line rate needs the reference clock, so it is left out.
+> getParameters 0 2 4
+rc=0x00000000
+rxpll_divsel45_fb=5
+rxpll_divsel_fb=4
+rxpll_divsel_out=1
+rxpll_divsel_ref=1
+tx_data_width=32
+tx_oversample=off
+txpll_divsel45_fb=4
+txpll_divsel_fb=4
+txpll_divsel_out=1
+txpll_divsel_ref=1
+# R2Qra: whole numbers, 156.25 counts as 156; only the channel asked for is given; an output
+# divider without choice gives 0.
 > initialize 0 2 1
 rc=0x00000000
 > getParameters 0 2 1 line_rate1 refclk_freq=156.25
 rc=0x00000000
 line_rate1=1950
 refclk_freq=156.25
-> getParameters 0 2 1 line_rate0 refclk_freq=9223372036854775807
-message 256: Cannot calculate line_rate0, since the result does not fit in 64 bits.
+> poke 0 2 1 0x03 0x2304
+> getParameters 0 2 1 line_rate0 line_rate1 refclk_freq=9223372036854775807
+message 256: Cannot calculate line_rate1, since the result does not fit in 64 bits.
 rc=0x80000000
-line_rate0=
+line_rate0=0
+line_rate1=
 refclk_freq=9223372036854775807
 > getParameters 0 2 1
 rc=0x00000000
 pll_divsel_fb=5
 pll_divsel_ref=1
-pll_rxdivsel_out_0=2
+pll_rxdivsel_out_0=
 pll_rxdivsel_out_1=4
 refclk_input=own
 # exit 1
