@@ -1,11 +1,14 @@
 // Reference-clock source questions of the first family (R2Qra) along next_slave links that no
-// board gives: links back to a dual already asked, and drivers several duals away.
+// board gives (links back to a dual already asked, drivers several duals away), and a host's
+// choice list that is not empty.
 #include <gtest/gtest.h>
 
 #include <map>
 #include <string>
+#include <vector>
 
 #include "host/OrvCore.h"
+#include "orvnebu/orvnebu.h"
 #include "slave/OrvNebu_DefaultSlave.h"
 #include "support/TestHost.h"
 #include "transceiver/OrvNebu_RefClockParamAction.h"
@@ -42,7 +45,7 @@ public:
     OrvNebu_RefClockParamAction action{this, 5002};
 };
 
-class RefClockChain : public TestHost {
+class TransceiverHost : public TestHost {
 protected:
     Dual& dual(uint32_t index, const std::string& next) {
         auto* slave = new Dual(index, next);
@@ -53,7 +56,7 @@ protected:
 
 }  // namespace
 
-TEST_F(RefClockChain, LoopsEndWithTheUnknownSourceAndFarDriversAreFound) {
+TEST_F(TransceiverHost, RefClockLoopsEndWithTheUnknownSourceAndFarDriversAreFound) {
     // 4 -> 5 -> 6 -> 4: no dual drives, so every question would go round for ever.
     Dual& a = dual(4, "1");
     Dual& b = dual(5, "1");
@@ -86,4 +89,16 @@ TEST_F(RefClockChain, LoopsEndWithTheUnknownSourceAndFarDriversAreFound) {
     first.memory["CLKNORTH_SEL"] = "1";
     EXPECT_EQ("dual_10:0", last.ask());
     EXPECT_NO_MESSAGES();
+}
+
+TEST_F(TransceiverHost, LineRateChoicesReplaceTheCallersList) {
+    loadBoard(R"({"devices": [{"chains": {"2": {"cores": [{"type": 14, "master": {"slaveCount": 1,
+        "slaves": {"0": {"slaveType": "0x44", "driverVersion": 1}}}}]}}}]})");
+    const ORV_SLAVE_REF ref{0, 2, 0};
+    ASSERT_EQ(ORVNEBU_OK, OrvNebu_initialize(HANDLE, ref));
+    ORV_HASHMAP_HANDLE params = makeMap({{"line_rate0", ""}, {"refclk_freq0", "0"}});
+    std::vector<std::string> list{"stale"};
+    void* listHandle = &list;
+    EXPECT_EQ(ORVNEBU_OK, OrvNebu_getParameterChoices(HANDLE, ref, &params, &listHandle));
+    EXPECT_TRUE(list.empty());
 }

@@ -76,7 +76,4 @@ TEST(VanduSlaves, TheSlaveClassTableDescribesEachClassAsItRegisters) {
     expectAsTheTableSays<OrvNebu_VanduR2Qra>(Table::VANDU_R2QRA);
     expectAsTheTableSays<OrvNebu_VanduR3Qra>(Table::VANDU_R3QRA);
     expectAsTheTableSays<OrvNebu_VanduR3Qrb>(Table::VANDU_R3QRB);
-    Orv_HashMapCStr quad{{"QUAD_NUMBER", "2"}, {"QUAD_COORDINATE", "5"}};
-    std::string name;
-    EXPECT_EQ("quad_2:5", OrvNebu_VanduR3Qrb::makeLocationName(quad, name));
 }
