@@ -26,7 +26,6 @@ TEST(PllLineRateChoiceString, FormatAndReading) {
         // A divider past 64 bits saturates instead of overflowing the scan.
         {"1 FB=99999999999999999999999, REF=1, DIVSEL=1", true, 1.0, UINT64_MAX, 1, 1},
         {"foo", false, 0, 0, 0, 0},
-        {"", false, 0, 0, 0, 0},
         {"100 FB=1, REF=2, DIVSEL=", false, 0, 0, 0, 0},
         {"100 FB=1, REF=2", false, 0, 0, 0, 0},
         {"100 FB=a, REF=2, DIVSEL=3", false, 0, 0, 0, 0},
