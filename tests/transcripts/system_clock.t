@@ -10,14 +10,8 @@ rc=0x00000000
 PLL_DIVSEL_FB0=3
 TXUSRCLK2_FREQ_TUNE0=FFFF
 TXUSRCLK_FREQ_TUNE0=AF00
-> setParameters 0 2 0 "line_rate0=2500.000 FB=2, REF=1, DIVSEL=1" sysclk_freq=nan
-message 256: Cannot calculate new line rate tune values, since sysclk_freq 'nan' is not a positive number.
-rc=0x80000000
 > setParameters 0 2 0 "line_rate0=2500.000 FB=2, REF=1, DIVSEL=1" sysclk_freq=-50
 message 256: Cannot calculate new line rate tune values, since sysclk_freq '-50' is not a positive number.
-rc=0x80000000
-> setParameters 0 2 0 "line_rate0=2500.000 FB=2, REF=1, DIVSEL=1" sysclk_freq=
-message 256: Cannot calculate new line rate tune values, since sysclk_freq '' is not a positive number.
 rc=0x80000000
 > setParameters 0 2 0 "line_rate0=2500.000 FB=2, REF=1, DIVSEL=1" sysclk_freq=0x32
 message 256: Cannot calculate new line rate tune values, since sysclk_freq '0x32' is not a positive number.

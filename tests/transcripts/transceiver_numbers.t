@@ -7,8 +7,6 @@ rc=0x00000000
 rc=0x00000000
 > initialize 0 2 4
 rc=0x00000000
-> initialize 0 2 5
-rc=0x00000000
 > getParameters 0 2 0 txusrclk0_freq sysclk_freq=0x32
 rc=0x00000000
 sysclk_freq=0x32
@@ -17,14 +15,6 @@ txusrclk0_freq=0.000000
 rc=0x00000000
 sysclk_freq=0x32
 txusrclk0_freq=0
-> getParameters 0 2 4 txusrclk_freq sysclk_freq=0x32
-rc=0x00000000
-sysclk_freq=0x32
-txusrclk_freq=0.000000
-> getParameters 0 2 5 txuserclkout_freq sysclk_freq=0x32
-rc=0x00000000
-sysclk_freq=0x32
-txuserclkout_freq=0.000000
 > getParameters 0 2 0 txusrclk0_freq sysclk_freq=+5e1
 rc=0x00000000
 sysclk_freq=+5e1

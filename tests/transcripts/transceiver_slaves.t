@@ -21,21 +21,12 @@ message 256: Cannot calculate line rate choices, since refclk_freq0 has not been
 rc=0x80000000
 > setParameters 0 2 0 "line_rate0=2500.000 FB=2, REF=1, DIVSEL=1" sysclk_freq=50
 rc=0x00000000
-> peek 0 2 0 0x04
-peek=0x0301
-> peek 0 2 0 0x19
-peek=0xAF00
-> peek 0 2 0 0x1D
-peek=0xFFFF
+> peek 0 2 0 0x04 26
+peek=0x0301 0x035C 0x0000 0x0000 0x0000 0x0000 0x0000 0x0000 0x0000 0x0000 0x0000 0x0000 0xDABE 0xAF00 0xC7FD 0xFFFF 0xDABE 0xAF00 0xC7FD 0xFFFF 0xDABE 0xAF00 0xC7FD 0xFFFF 0x9FFD 0xFFFF
 > getParameters 0 2 0 line_rate0 refclk_freq0=125
 rc=0x00000000
 line_rate0=2500.000 FB=2, REF=1, DIVSEL=1
 refclk_freq0=125
-> setParameters 0 2 0 "line_rate0=-625.000 FB=2, REF=1, DIVSEL=4" sysclk_freq=50
-message 256: Unable to set line rate from string '-625.000 FB=2, REF=1, DIVSEL=4'
-rc=0x80000000
-> peek 0 2 0 0x04
-peek=0x0301
 # First family (duals 1 to 3, chained by next_slave): whole numbers.
 > initialize 0 2 1
 rc=0x00000000
