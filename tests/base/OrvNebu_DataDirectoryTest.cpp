@@ -64,8 +64,8 @@ TEST(DataDirectory, ARowBuildsTheClassOfEachOfItsVersions) {
         row.minDriverVersion = r.min;
         row.maxDriverVersion = r.max;
         EXPECT_EQ(OrvNebu_DataDirectory::classesOf(row), r.classes) << r.type << " " << r.min;
-        if (r.classes.empty())
-            continue;  // the row's first and last version: what the factory builds
+        // The row's first and last version build what the factory finds for them.
+        if (r.classes.empty()) continue;
         EXPECT_EQ(Classes::find(r.type, r.min), r.classes.front()) << r.type << " " << r.min;
         EXPECT_EQ(Classes::find(r.type, r.max), r.classes.back()) << r.type << " " << r.max;
     }
@@ -210,13 +210,16 @@ TEST(DefinitionFiles, ProblemsWherePlacedAndWhatIsKept) {
          "lines 2 A/4",
          "lines 2 A/4"},
         {'r',
-         "h\nA,1,0,32,3,,rw,,y\nB,1,0,0,33,,rw,,y\nC,20000,0,0,3,,rw,,y\nD,1ffff,0,0,0,,rw,,y\n",
+         "h\nA,1,0,32,3,,rw,,y\nB,1,0,31,33,,rw,,y\nC,20000,0,0,3,,rw,,y\nD,1ffff,0,0,0,,rw,,y\n",
          "2:4:256 Register bit out of range 0 to 31: start bit 32, end bit 3 +256 +512\n"
-         "3:5:256 Register bit out of range 0 to 31: start bit 0, end bit 33 +256 +512\n"
+         "3:5:256 Register bit out of range 0 to 31: start bit 31, end bit 33 +256 +512\n"
          "4:2:256 Register address out of range 0 to 1ffff: 20000 +256 +512\n"
          "lines 5 D/1",
          "2:4:256 Register bit out of range 0 to 31: start bit 32, end bit 3 +256 +512\n"
          "lines"},
+        {'r', "h\nC,20000,0,0,3,,rw,,y\nD,1,0,0,0,,rw,,y\n",
+         "2:2:256 Register address out of range 0 to 1ffff: 20000 +256 +512\nlines 3 D/1",
+         "2:2:256 Register address out of range 0 to 1ffff: 20000 +256 +512\nlines"},
         {'r', "h\nA,1,0\n\nB,2,0,0,0,,rw,,y\n",
          "2:0:512 line of 3 columns: a register line needs 9 columns +512\n"
          "3:0:512 empty line: a register line needs 9 columns +512\n"
