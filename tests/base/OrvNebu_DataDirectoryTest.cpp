@@ -40,6 +40,10 @@ TEST(DataDirectory, DemoRowsTheirClassesAndTheirFiles) {
     ASSERT_NE(registers, nullptr);
     EXPECT_NE(registers->findRegister("CTRL_MODE"), nullptr);
     EXPECT_EQ(data.filesRead(), 12u);
+    OrvNebu_DataDirectory::Row foreign;  // a row of some other directory: none of its files
+    foreign.registers = foreign.parameters = "other.csv";
+    EXPECT_EQ(data.registerFile(foreign), nullptr);
+    EXPECT_EQ(data.paramFile(foreign), nullptr);
 }
 
 TEST(DataDirectory, ARowBuildsTheClassOfEachOfItsVersions) {
@@ -47,11 +51,12 @@ TEST(DataDirectory, ARowBuildsTheClassOfEachOfItsVersions) {
     const struct {
         int32_t type, min, max;
         C classes;
-    } rows[] = {{0x44, 1, 3, C{Classes::VANDU_M3QRC, Classes::DEFAULT_SLAVE}},
+    } rows[] = {{0x44, 1, 2, C{Classes::VANDU_M3QRC, Classes::DEFAULT_SLAVE}},
                 {0x44, 2, 9, C{Classes::DEFAULT_SLAVE}},
                 {0x15, 0, 7, C{Classes::DEFAULT_SLAVE, Classes::VANDU_R3QRA}},
                 {0x42, 1, 1, C{Classes::VANDU_R2QRA}},
                 {0x99, 1, 1, C{Classes::DEFAULT_SLAVE}},
+                {0x41, 0, 2, C{Classes::DEFAULT_SLAVE}},
                 {0x45, 5, 4, C{}}};
     for (const auto& r : rows) {
         OrvNebu_DataDirectory::Row row;
@@ -59,7 +64,24 @@ TEST(DataDirectory, ARowBuildsTheClassOfEachOfItsVersions) {
         row.minDriverVersion = r.min;
         row.maxDriverVersion = r.max;
         EXPECT_EQ(OrvNebu_DataDirectory::classesOf(row), r.classes) << r.type << " " << r.min;
+        // The row's first and last version build what the factory finds for them.
+        if (r.classes.empty()) continue;
+        EXPECT_EQ(Classes::find(r.type, r.min), r.classes.front()) << r.type << " " << r.min;
+        EXPECT_EQ(Classes::find(r.type, r.max), r.classes.back()) << r.type << " " << r.max;
     }
+    EXPECT_EQ(Classes::info(Classes::SLAVE_CLASS_COUNT).slaveClass, Classes::DEFAULT_SLAVE);
+    // A line rate writes its own registers and the window registers of its channel's clocks.
+    auto registersOf = [](Classes::SlaveClass c) {
+        std::string all;
+        for (const std::string& r : Classes::info(c).actions.at(1).registers) all += r + ' ';
+        return all;
+    };
+    EXPECT_EQ(registersOf(Classes::VANDU_M3QRC),
+              "MAX_LINERATE TXOUTCLK_FREQ_TUNE0 RXRECCLK_FREQ_TUNE0 TXUSRCLK_FREQ_TUNE0 "
+              "TXUSRCLK2_FREQ_TUNE0 RXUSRCLK_FREQ_TUNE0 RXUSRCLK2_FREQ_TUNE0 ");
+    EXPECT_EQ(registersOf(Classes::VANDU_R3QRA),
+              "MAX_LINERATE TX_OVERSAMPLE_MODE TXUSRCLK_FREQ_TUNE TXUSRCLK2_FREQ_TUNE "
+              "RXUSRCLK_FREQ_TUNE RXUSRCLK2_FREQ_TUNE TXOUTCLK_FREQ_TUNE RXRECCLK_FREQ_TUNE ");
 }
 
 // Number fields as the readers take them: C-style prefixes, saturation, no overflow.
@@ -108,10 +130,11 @@ std::string readAs(char kind, const std::string& path, bool every) {
                                                  : OrvNebu_RegisterFile::FIRST_REFUSAL);
         problems(f.problems());
         out << "lines";
-        for (const auto& s : f.lines()) out << ' ' << s.line << (s.included ? "" : "x");
+        for (const auto& s : f.lines())
+            out << ' ' << s.line << (s.included ? "" : "x") << (s.bitReversed() ? "r" : "");
         const std::map<std::string, OrvNebu_RegisterFile::Register> sorted(f.registers().begin(),
                                                                            f.registers().end());
-        for (const auto& r : sorted) out << ' ' << r.first << '/' << r.second.totalWidth;
+        for (const auto& r : sorted) out << ' ' << r.second.name << '/' << r.second.totalWidth;
     } else if (kind == 'p') {
         const OrvRT::OrvNebu_ParamFile f(path, every ? OrvRT::OrvNebu_ParamFile::EVERY_PROBLEM
                                                      : OrvRT::OrvNebu_ParamFile::FIRST_REFUSAL);
@@ -162,7 +185,7 @@ TEST(DefinitionFiles, ProblemsWherePlacedAndWhatIsKept) {
          SAME},
         {'r', "h\nOFF,5,0,0,3,,rw,,n\nW,10,1,0,7,,r,,y\nBAD,zz,0,0,3,,rw,,y\nW,11,0,15,8,,rw,,y\n",
          "4:2:256 Invalid hexadecimal number \"zz\". +256 +512\n"
-         "lines 2x 3 5 W/16",
+         "lines 2x 3 5r W/16",
          "4:2:256 Invalid hexadecimal number \"zz\". +256 +512\n"
          "lines 2x 3 W/8"},
         {'r', "A,1,0,0,3,,rw,,y\nB,2,0,0,3,,rw,,y\n",
@@ -173,6 +196,7 @@ TEST(DefinitionFiles, ProblemsWherePlacedAndWhatIsKept) {
         // First lines that are not register lines, and one that is.
         {'r', "A,zz,0,0,3,,rw,,y\nB,2,0,0,3,,rw,,y\n", "lines 2 B/4", SAME},
         {'r', "A,1,x,0,3,,rw,,y\nB,2,0,0,3,,rw,,y\n", "lines 2 B/4", SAME},
+        {'r', "A, ,0,0,3,,rw,,y\nB,2,0,0,3,,rw,,y\n", "lines 2 B/4", SAME},
         {'r', "A,1,0,x,3,,rw,,y\nB,2,0,0,3,,rw,,y\n", "lines 2 B/4", SAME},
         {'r', "A,1,.,0,3,,rw,,y\nB,2,0,0,3,,rw,,y\n", "lines 2 B/4", SAME},
         {'r', "A,1,+5,0,3,,rw,,y\nB,2,0,0,3,,rw,,y\n",
@@ -186,13 +210,16 @@ TEST(DefinitionFiles, ProblemsWherePlacedAndWhatIsKept) {
          "lines 2 A/4",
          "lines 2 A/4"},
         {'r',
-         "h\nA,1,0,32,3,,rw,,y\nB,1,0,0,33,,rw,,y\nC,20000,0,0,3,,rw,,y\nD,1ffff,0,0,0,,rw,,y\n",
+         "h\nA,1,0,32,3,,rw,,y\nB,1,0,31,33,,rw,,y\nC,20000,0,0,3,,rw,,y\nD,1ffff,0,0,0,,rw,,y\n",
          "2:4:256 Register bit out of range 0 to 31: start bit 32, end bit 3 +256 +512\n"
-         "3:5:256 Register bit out of range 0 to 31: start bit 0, end bit 33 +256 +512\n"
+         "3:5:256 Register bit out of range 0 to 31: start bit 31, end bit 33 +256 +512\n"
          "4:2:256 Register address out of range 0 to 1ffff: 20000 +256 +512\n"
          "lines 5 D/1",
          "2:4:256 Register bit out of range 0 to 31: start bit 32, end bit 3 +256 +512\n"
          "lines"},
+        {'r', "h\nC,20000,0,0,3,,rw,,y\nD,1,0,0,0,,rw,,y\n",
+         "2:2:256 Register address out of range 0 to 1ffff: 20000 +256 +512\nlines 3 D/1",
+         "2:2:256 Register address out of range 0 to 1ffff: 20000 +256 +512\nlines"},
         {'r', "h\nA,1,0\n\nB,2,0,0,0,,rw,,y\n",
          "2:0:512 line of 3 columns: a register line needs 9 columns +512\n"
          "3:0:512 empty line: a register line needs 9 columns +512\n"
@@ -217,8 +244,8 @@ TEST(DefinitionFiles, ProblemsWherePlacedAndWhatIsKept) {
          "11:4:0 register G: bit 31 of word 0x4 lie beyond the 16-bit bus word\n"
          "14:2:0 registers span words 0x0 (line 14) to 0x1ffff (line 12): 131072 words, more than "
          "one burst moves (131071), so a read of every register fails\n"
-         "lines 2 3 4 5 6 7 8 9 10 11 12 13 14 A/9 B/2 C/32 D/32 E/1 F/31 G/1 H/1 I/1 J/1",
-         "lines 2 3 4 5 6 7 8 9 10 11 12 13 14 A/9 B/2 C/32 D/32 E/1 F/31 G/1 H/1 I/1 J/1"},
+         "lines 2 3r 4 5 6 7 8r 9 10 11 12 13 14 A/9 B/2 C/32 D/32 E/1 F/31 G/1 H/1 I/1 J/1",
+         "lines 2 3r 4 5 6 7 8r 9 10 11 12 13 14 A/9 B/2 C/32 D/32 E/1 F/31 G/1 H/1 I/1 J/1"},
         {'p', "MODE,0,Off,EN=0\nMODE,1,On,EN=1\n",
          "1:0:0 the first line is a parameter row, but the first line of a parameter file is its "
          "header: choice Off of parameter MODE is lost\n"
@@ -335,6 +362,10 @@ TEST(DefinitionFiles, ProblemsWherePlacedAndWhatIsKept) {
         EXPECT_EQ(r.every, every);
         EXPECT_EQ(r.first == SAME ? r.every : r.first, first);
     }
+    // A parameter far down the file still comes after those above it.
+    dir.write("f.csv", "h" + std::string(9999, '\n') + "B,0,b,\n");
+    const OrvRT::OrvNebu_ParamFile far(dir.path("f.csv"), OrvRT::OrvNebu_ParamFile::EVERY_PROBLEM);
+    EXPECT_EQ(far.parameters().at(0).priority, 20000u);
 }
 
 }  // namespace
