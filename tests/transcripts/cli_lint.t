@@ -3,8 +3,6 @@
 # and line, in file and line order; usage errors exit 2.
 $ nebu lint ../../data
 lint ../../data/: 9 directory lines, 12 definition files, no problems
-$ nebu lint ../../data/
-lint ../../data/: 9 directory lines, 12 definition files, no problems
 $ nebu lint cli_lint/many
 cli_lint/many/a_params.csv:3: parameter mode, choice run: value 0x4 of register LOOP needs 3 bits, the register has 1
 cli_lint/many/a_params.csv:4: parameter mode, choice loop: register LOOPER is not in cli_lint/many/a_regs.csv
@@ -43,28 +41,6 @@ lint cli_lint/many/: 28 directory lines, 23 definition files, 32 problems
 $ nebu lint cli_lint
 cli_lint/orvnebu_directory.csv: Unable to open cli_lint/orvnebu_directory.csv
 lint cli_lint/: 0 directory lines, 0 definition files, 1 problem
-[exit 1]
-$ nebu lint cli_lint/bom
-cli_lint/bom/orvnebu_directory.csv:1: byte-order mark before the header: it is read as part of the first column's name
-cli_lint/bom/orvnebu_directory.csv:1: Unable to parse header of CSV file: cli_lint/bom/orvnebu_directory.csv: it has no slave_type column
-lint cli_lint/bom/: 0 directory lines, 0 definition files, 2 problems
-[exit 1]
-$ nebu lint cli_lint/header
-cli_lint/header/orvnebu_directory.csv:1: Unable to parse header of CSV file: cli_lint/header/orvnebu_directory.csv: it has no orv_drv_ver_max column
-lint cli_lint/header/: 0 directory lines, 0 definition files, 1 problem
-[exit 1]
-$ nebu lint cli_lint/narrow
-cli_lint/narrow/orvnebu_directory.csv:1: Unable to parse header of CSV file: cli_lint/narrow/orvnebu_directory.csv: it has 1 column, at least 5 are needed
-lint cli_lint/narrow/: 0 directory lines, 0 definition files, 1 problem
-[exit 1]
-$ nebu lint cli_lint/noregs
-cli_lint/noregs/orvnebu_directory.csv:1: the header has no registers column: no slave can be created
-cli_lint/noregs/orvnebu_directory.csv:2: Unable to open OrvNebu parameter file: cli_lint/noregs/x.csv
-lint cli_lint/noregs/: 2 directory lines, 0 definition files, 2 problems
-[exit 1]
-$ nebu lint cli_lint/regsfirst
-cli_lint/regsfirst/orvnebu_directory.csv:2: slave type 0x31 has no register file: its slaves cannot be created
-lint cli_lint/regsfirst/: 2 directory lines, 1 definition files, 1 problem
 [exit 1]
 $ nebu lint cli_lint/absent
 nebu: lint: no data directory 'cli_lint/absent'
