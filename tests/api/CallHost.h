@@ -14,13 +14,13 @@
 class CallHost : public TestHost {
 protected:
     // Device 0, chain 1: a plain core, then a master with 4 positions: a control block at 0
-    // (word 0 = enable 1, mode 1 "run", clock divider 0x12), the others empty; chain 2: a
+    // (word 0 = enable 1, mode 1 "run", clock divider 0x12), the others empty; chain 0: a
     // 2-slave master. Device 1 is a configuration controller.
     static constexpr const char* CALLS_BOARD = R"({ "devices": [ { "chains": { "1": { "cores": [
         { "type": 3 }, { "type": 14, "master": { "slaveCount": 4, "dclkHasReset": true,
         "slaves": { "0": { "slaveType": "0x11", "driverVersion": 1,
         "memory": { "0x0000": "0x1203" } } } } } ] },
-        "2": { "cores": [ { "type": 14, "master": { "slaveCount": 2 } } ] } } },
+        "0": { "cores": [ { "type": 14, "master": { "slaveCount": 2 } } ] } } },
       { "trellom": true, "chains": { "1": { "cores": [ { "type": 14, "master": {
         "slaveCount": 2 } } ] } } } ] })";
     static constexpr uint32_t H = HANDLE;
