@@ -161,6 +161,7 @@ TEST_F(CallsTest, LongBurstsUseTheWholeCountFieldAndNoMore) {
     EXPECT_EQ(after(OrvNebu_burstSlaveWrite(H, at(1), 0, 0, many.data(), 131072, nullptr)),
               refused);
     EXPECT_EQ(after(OrvNebu_burstSlaveRead(H, at(1), 0, 0, many.data(), 131072, nullptr)), refused);
+    EXPECT_EQ(stats().commands, 0u) << "refused before anything is sent";
     EXPECT_EQ(OrvNebu_burstSlaveRead(H, at(1), 0, 0, many.data(), 131071, nullptr), 0u);
     EXPECT_EQ(many[131070], 0x1203u);
 }
