@@ -2,12 +2,12 @@
 // may break, and the session messages read as one text: "SEVERITY TEXT|" each.
 #pragma once
 
-#include <filesystem>
-#include <memory>
-#include <string>
+#include <functional>
 
+#include "api/OrvNebu_Frame.h"
 #include "host/OrvCore.h"
 #include "orvnebu/orvnebu.h"
+#include "registers/OrvNebu_DefaultRegisterHandler.h"
 #include "support/TempDataDir.h"
 #include "support/TestHost.h"
 

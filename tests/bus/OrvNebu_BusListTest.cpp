@@ -1,11 +1,6 @@
 // The bus list where the console cannot reach it: boards that change under a known bus, and the
 // list's registration as the host's session listener.
-#include <gtest/gtest.h>
-
-#include <string>
-
 #include "api/CallHost.h"
-#include "bus/OrvNebu_BusList.h"
 
 namespace {
 

@@ -1,45 +1,30 @@
 // The failures the plug-in must survive where the console cannot stage them: a data directory
 // broken under a running session and a board swapped under a known bus. Each checks the exact
 // messages with their severities, the return code, and what the caller's data holds after.
-#include <gtest/gtest.h>
-
-#include <filesystem>
-#include <fstream>
-#include <memory>
-#include <string>
-
 #include "api/CallHost.h"
-#include "host/OrvCore.h"
-#include "registers/OrvNebu_DefaultRegisterHandler.h"
-#include "support/TempDataDir.h"
-
-namespace {
 
 using FaultTableTest = CallHost;
 
 TEST_F(FaultTableTest, AnUnreadableFileFailsInitializeWithAnAbortAndLeavesNoSlave) {
-    const struct {
-        const char* file;
-        std::string report;  // the reader's message, before the file's path
-        bool before;  // initialized before (its old object goes first) and the file replaced by
-                      // a directory, or else the file removed
-    } rows[] = {
-        {"orvnebu_directory.csv", "Unable to open ", true},
-        {"ctrl_regs.csv", "Unable to open OrvNebu register file: ", true},
-        {"ctrl_params.csv", "Unable to open OrvNebu parameter file: ", false},
+    // The file, and the reader's message before its path. The first two were read before
+    // (the old slave object goes first) and become directories; the last is removed.
+    const std::pair<const char*, std::string> rows[] = {
+        {"orvnebu_directory.csv", "Unable to open "},
+        {"ctrl_regs.csv", "Unable to open OrvNebu register file: "},
+        {"ctrl_params.csv", "Unable to open OrvNebu parameter file: "},
     };
     for (const auto& row : rows) {
-        SCOPED_TRACE(row.file);
+        const bool before = &row != &rows[2];
         freshHost();
-        if (row.before) {
+        if (before) {
             ASSERT_EQ(OrvNebu_initialize(H, at(1)), ORVNEBU_OK);
         }
-        std::filesystem::remove(data_->path(row.file));
-        if (row.before) std::filesystem::create_directory(data_->path(row.file));
+        std::filesystem::remove(data_->path(row.first));
+        if (before) std::filesystem::create_directory(data_->path(row.first));
         said();
         EXPECT_EQ(OrvNebu_initialize(H, at(1)), ORVNEBU_FAILED);
         EXPECT_EQ(said(),
-                  "256 " + row.report + data_->path(row.file) + "|32768 Orv abort command|");
+                  "256 " + row.second + data_->path(row.first) + "|32768 Orv abort command|");
         EXPECT_FALSE(registered());
         EXPECT_EQ(OrvRT::OrvNebu_DefaultRegisterHandler::getHandlerCount(), 0u);
     }
@@ -81,5 +66,3 @@ TEST_F(FaultTableTest, ABoardSwappedUnderAKnownBusFailsItsCallsAndKeepsTheCaller
     EXPECT_EQ(after(OrvNebu_initialize(H, at(1))), noBus);
     EXPECT_TRUE(registered());  // a failed initialize removes nothing
 }
-
-}  // namespace
