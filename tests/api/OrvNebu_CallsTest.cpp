@@ -39,7 +39,8 @@ TEST_F(CallsTest, ExceptionsBecomeOneMessageSentWithoutTheTargetLock) {
     OrvSim::TargetLockUse use = OrvSim::takeTargetLockUse(H);
     EXPECT_EQ(use.callsHeld, 1u);
     EXPECT_EQ(use.callsUnheld, 1u);
-    // Every call takes it with 60 s (nested calls take it again); terminate does without.
+    // Every call takes it with 60 s and no other timeout (nested calls take it again), and makes
+    // no host call without it; terminate does without.
     ASSERT_EQ(OrvNebu_initialize(H, at(1)), 0u);
     use = OrvSim::takeTargetLockUse(H);
     EXPECT_EQ(use.takesByTimeout.size() + use.callsUnheld, 1u);
@@ -50,8 +51,8 @@ TEST_F(CallsTest, ExceptionsBecomeOneMessageSentWithoutTheTargetLock) {
     EXPECT_GT(use.callsUnheld, 0u);
 }
 
-// A check fails with its own message before anything is sent; on an unknown bus the bus is
-// reported first. The console passes these pointers always valid.
+// A check fails with its own message; on an unknown bus the bus is reported first. The console
+// always passes these pointers valid.
 TEST_F(CallsTest, EachCheckFailsWithItsOwnMessageAfterTheBusLookup) {
     static ORV_HASHMAP_HANDLE none = nullptr;
     // A call on a user chain, and its check's message after "OrvNebu_" (or none).
@@ -94,7 +95,8 @@ TEST_F(CallsTest, SlaveCallsCheckTheirArgumentsOnceTheSlaveIsResolved) {
               "failed|256 OrvNebu_getRegisters() argument checking failed:(registers != 0)|");
     EXPECT_EQ(after(OrvNebu_setRegisters(H, at(1), nullptr)),
               "failed|256 OrvNebu_setRegisters() argument checking failed:(registers != 0)|");
-    // Sizes whose character count does not fit 32 bits: refused, nothing written or read.
+    // A size whose character count (4 per word and the terminator) does not fit 32 bits is
+    // refused; the largest that fits goes on to the text check.
     char text[8];
     EXPECT_EQ(after(OrvNebu_write(H, at(1), 0, 2, nullptr)),
               "failed|256 OrvNebu_write() argument checking failed:(data != 0) && (size != 0)|");
