@@ -182,6 +182,13 @@ jtag read cmd=2 bits=4 data=0x2
 jtag write cmd=1 bits=257 data=0x00000000000000000000000000000000000000000000000000000000000000000
 rc=0x00000000
 slaveHandles=0
+# The highest slave index a transfer can name, all 8 bits of it on the wire.
+> singleSlaveRead 0 2 255 0
+jtag write cmd=4 bits=29 data=0x0FF00000
+jtag write cmd=5 bits=19 data=0x00000
+jtag read cmd=6 bits=16 data=0x0000
+rc=0x00000000
+buffer=0x0000
 > endSession 1
 > getSlaveHandles 0 2 1
 rc=0x00000000
