@@ -38,7 +38,7 @@ check() {
   chrome "$url" --hide-scrollbars --window-size="$size" --screenshot="$shot" >/dev/null ||
     fail "$page: no screenshot"
   local ink pixels
-  read -r ink pixels < <(python3 "$here/png_tool.py" ink "$shot" "$colour" |
+  read -r ink pixels < <(python3 "$here/../../scripts/png_tool.py" ink "$shot" "$colour" |
                          sed 's/ink=\([0-9.]*\) colour=\([0-9]*\)/\1 \2/')
   python3 -c "import sys; sys.exit(0 if $ink > 0.03 else 1)" || fail "$page: blank screenshot"
   [ "$pixels" -ge "$least" ] || fail "$page: only $pixels pixels of $colour: no stylesheet or picture"

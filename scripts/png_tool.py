@@ -1,5 +1,5 @@
 #!/usr/bin/env python3
-"""Reads the PNG screenshots of the browser test with the standard library alone.
+"""Reads the PNG screenshots of the browser test and the README with the standard library alone.
 
 png_tool.py ink FILE R,G,B     prints the share of pixels that are not white and the number of
                                pixels of colour R,G,B ("ink=0.1234 colour=5678")
