@@ -26,17 +26,12 @@ std::string logicErrorOf(const std::function<void()>& f) {
 // MODE: Off (EN=0), On (EN=1, SEL=01), Fast (EN=1, SEL=10), Same (EN=1, SEL=01 again).
 OrvNebu_ParamChoiceAction makeMode() {
     OrvNebu_ParamChoiceAction mode("MODE", 10002);
-    mode.addChoice("Off", 0);
-    mode.addChoiceRegSetting(0, 1, "EN", "0");
-    mode.addChoice("On", 1);
-    mode.addChoiceRegSetting(1, 1, "EN", "1");
-    mode.addChoiceRegSetting(1, 2, "SEL", "1");
-    mode.addChoice("Fast", 2);
-    mode.addChoiceRegSetting(2, 1, "EN", "1");
-    mode.addChoiceRegSetting(2, 2, "SEL", "2");
-    mode.addChoice("Same", 3);
-    mode.addChoiceRegSetting(3, 1, "EN", "1");
-    mode.addChoiceRegSetting(3, 2, "SEL", "1");
+    const char* const names[] = {"Off", "On", "Fast", "Same"};
+    for (uint32_t i = 0; i < 4; ++i) {
+        mode.addChoice(names[i], i);
+        mode.addChoiceRegSetting(i, 1, "EN", i == 0 ? "0" : "1");
+        if (i != 0) mode.addChoiceRegSetting(i, 2, "SEL", i == 2 ? "2" : "1");
+    }
     return mode;
 }
 
@@ -85,18 +80,15 @@ TEST(ParamChoiceAction, HexValueComparison) {
         const char* b;
         bool equal;
     };
-    const Case cases[] = {
-        {"0x001F", "1f", true}, {"0x001F", "001F", true}, {"1f", "001F", true},
-        {"0X1f", "0x1F", true}, {"0", "", true},          {"0x0", "", true},
-        {"000", "0", true},     {"0x", "", true},         {"1", "01", true},
-        {"1", "10", false},     {"1f", "1e", false},      {" 1", "1", false},
-        {"0x0x1", "1", false},  {"00x1", "1", false},     {"ABC", "abc", true},
-    };
+    const Case cases[] = {{"0x001F", "1f", true}, {"0x001F", "001F", true}, {"1f", "001F", true},
+                          {"0X1f", "0x1F", true}, {"0", "", true},          {"0x0", "", true},
+                          {"000", "0", true},     {"0x", "", true},         {"1", "01", true},
+                          {"1", "10", false},     {"1f", "1e", false},      {" 1", "1", false},
+                          {"0x0x1", "1", false},  {"00x1", "1", false},     {"ABC", "abc", true}};
     for (const Case& c : cases) {
-        EXPECT_EQ(c.equal, OrvNebu_ParamChoiceAction::hexValuesEqual(c.a, c.b))
-            << c.a << " vs " << c.b;
-        EXPECT_EQ(c.equal, OrvNebu_ParamChoiceAction::hexValuesEqual(c.b, c.a))
-            << c.b << " vs " << c.a;
+        SCOPED_TRACE(std::string(c.a) + " vs " + c.b);
+        EXPECT_EQ(c.equal, OrvNebu_ParamChoiceAction::hexValuesEqual(c.a, c.b));
+        EXPECT_EQ(c.equal, OrvNebu_ParamChoiceAction::hexValuesEqual(c.b, c.a));
     }
 }
 

@@ -28,8 +28,8 @@ protected:
     }
 
     std::string parseError(uint32_t line, const std::string& text) {
-        return "Unable to parse file: " + data_.path("regs.csv") + " line:" + std::to_string(line) +
-               ": " + text + "\n";
+        return "512 Unable to parse file: " + data_.path("regs.csv") +
+               " line:" + std::to_string(line) + ": " + text + "\n";
     }
 };
 
@@ -64,45 +64,34 @@ TEST_F(RegisterFileTest, PrintedImageNormalisesTheColumns) {
     }
     EXPECT_NO_MESSAGES();
 
-    for (const char* text : {"just a header\n", ""}) {
-        data_.write("empty.csv", text);
-        OrvNebu_RegisterHandler* h =
-            OrvNebu_DefaultRegisterHandler::getRegisterHandler(HANDLE, data_.path("empty.csv"));
-        ASSERT_NE(h, nullptr);
-        EXPECT_EQ(h->getRegisterCount(), 0u);
-        EXPECT_EQ(h->getMinAddress(), 0xFFFFFFFFu);
-        EXPECT_EQ(h->getMaxAddress(), 0u);
-        OrvNebu_DefaultRegisterHandler::releaseRegisterHandler(h);
-    }
+    data_.write("empty.csv", "");
+    OrvNebu_RegisterHandler* h =
+        OrvNebu_DefaultRegisterHandler::getRegisterHandler(HANDLE, data_.path("empty.csv"));
+    EXPECT_EQ(h->getRegisterCount(), 0u);
+    EXPECT_EQ(h->getMinAddress(), 0xFFFFFFFFu);
+    EXPECT_EQ(h->getMaxAddress(), 0u);
+    OrvNebu_DefaultRegisterHandler::releaseRegisterHandler(h);
 }
 
 TEST_F(RegisterFileTest, BadLinesAreReportedWithTheirLineNumbers) {
     struct Row {
         std::string file;
-        std::string reason;  // at 256 before the line, if any
+        std::string reason;  // the message before the line, if any
         uint32_t line;
         std::string text;
     };
     const Row rows[] = {
         {"h\nA,1,0,0,0,,rw,,y\n\nB,2,0,0,0,,rw,,y\n", "", 3, ""},
-        {"h\r\nA,1,0,0,0,,rw,y\r\n", "", 2, "A,1,0,0,0,,rw,y"},
-        {"h\nX,1,0,-1,3,,rw,,y\n", "start bit -1, end bit 3", 2, "X,1,0,-1,3,,rw,,y"},
-        {"h\nX,zz,0,0,3,,rw,,y\n", "zz", 2, "X,zz,0,0,3,,rw,,y"},  // the conversion's own message
+        {"h\nX,1,0,-1,3,,rw,,y\n", "256 Register bit out of range 0 to 31: start bit -1, end bit 3",
+         2, "X,1,0,-1,3,,rw,,y"},
     };
     for (const Row& row : rows) {
-        SCOPED_TRACE(row.file);
         EXPECT_EQ(initializeWith(row.file), ORVNEBU_FAILED);
-        const auto m = messages();
-        const size_t first = row.reason.empty() ? 0 : 1;
-        ASSERT_EQ(m.size(), first + 2);
-        if (first == 1) {
-            EXPECT_EQ(m[0].severity, 256u);
-            EXPECT_NE(m[0].text.find(row.reason), std::string::npos) << m[0].text;
-        }
-        EXPECT_EQ(m[first].severity, 512u);
-        EXPECT_EQ(m[first].text, parseError(row.line, row.text));
-        EXPECT_EQ(m[first + 1].severity, 32768u);
-        EXPECT_EQ(m[first + 1].text, "Orv abort command");
+        std::vector<std::string> got,
+            want{parseError(row.line, row.text), "32768 Orv abort command"};
+        if (!row.reason.empty()) want.insert(want.begin(), row.reason);
+        for (const auto& m : messages()) got.push_back(std::to_string(m.severity) + " " + m.text);
+        EXPECT_EQ(got, want);
     }
     // No slave object was made: the reference has none.
     clearMessages();

@@ -20,19 +20,17 @@ protected:
 };
 
 TEST_F(SingleRegisterHandlerTest, EachSliceIsOneReadModifyWriteOfItsWord) {
-    struct Row {
-        std::string name, value;  // an empty value: a read
-
+    const struct {
+        std::string name, value;                          // an empty value: a read
         std::vector<std::pair<uint32_t, uint64_t>> wire;  // address and data, in order
-    };
-    const Row rows[] = {
+    } rows[] = {
         // Only the words of the named registers; data of reads as the board holds them.
         {"A", "1234", {{2, 0x1002}, {2, 0x1234}}},
         {"B", "AB", {{8, 0xF00F}, {8, 0xFABF}}},
         // Each write carries the word as it stands after that slice's merge.
         {"TRIPLE",
          "ABC",
-         {{0x30, 0x00F0},
+         {{0x30, 0xF0},
           {0x30, 0xA0F0},
           {0x30, 0xA0F0},
           {0x30, 0xABF0},
@@ -40,7 +38,7 @@ TEST_F(SingleRegisterHandlerTest, EachSliceIsOneReadModifyWriteOfItsWord) {
           {0x30, 0xABFC}}},
         {"WIDE", "", {{0x11, 0x00AB}, {0x10, 0xCDEF}}},
     };
-    for (const Row& row : rows) {
+    for (const auto& row : rows) {
         SCOPED_TRACE(row.name);
         const bool write = !row.value.empty();
         for (uint32_t a = 2; a <= 7; ++a) poke(0, a, static_cast<uint16_t>(0x1000 + a));
