@@ -2,7 +2,6 @@
 #include <gtest/gtest.h>
 
 #include <functional>
-#include <sstream>
 #include <stdexcept>
 #include <string>
 #include <vector>
@@ -120,19 +119,4 @@ TEST(ParamChoiceAction, SettingCorners) {
     EXPECT_EQ("Setting Parameter 'MODE' to value ' On' is not a valid choice.",
               logicErrorOf([&] { mode.setParams(params, registers); }));
     EXPECT_EQ((Orv_HashMapCStr{{"EN", "1"}}), registers);
-}
-
-TEST(ParamChoiceAction, PrintsOneLinePerChoiceWithTheFirstWidth) {
-    OrvNebu_ParamChoiceAction a("P", 10002);
-    a.addChoice("Narrow", 0);
-    a.addChoiceRegSetting(0, 3, "R", "5");
-    a.addChoiceRegSetting(0, 0, "Z", "");
-    a.addChoice("Wide", 1);
-    // The width given first (3) stays; this value is printed cut to 3 bits.
-    a.addChoiceRegSetting(1, 8, "R", "FE");
-    a.addChoice("Empty", 2);
-    std::ostringstream out;
-    a.toCSVFile(out);
-    EXPECT_EQ("P,0,Narrow,R=101,Z=\nP,1,Wide,R=110\nP,2,Empty\n", out.str());
-    EXPECT_EQ(3u, a.getRegWidth("R"));
 }

@@ -184,29 +184,6 @@ TEST_F(DefaultSlaveParams, ArgumentChecksComeAfterTheSlave) {
     }
 }
 
-TEST_F(DefaultSlaveParams, SlavesOfASessionShareTheFileActions) {
-    initialize(CTRL);
-    initialize(CTRL2);
-    EXPECT_EQ(1u, OrvRT::OrvNebu_DefaultParamReader::cachedFileCount(SESSION));
-    EXPECT_EQ("Off", get(CTRL2, {{"MODE", ""}}).at("MODE"));
-    EXPECT_EQ("On", get(CTRL, {{"MODE", ""}}).at("MODE"));
-    // The slaves go, the cached actions stay until the session ends.
-    EXPECT_EQ(ORVNEBU_OK, OrvNebu_terminate(SESSION, CTRL));
-    EXPECT_EQ("Off", get(CTRL2, {{"MODE", ""}}).at("MODE"));
-    EXPECT_EQ(1u, OrvRT::OrvNebu_DefaultParamReader::cachedFileCount(SESSION));
-}
-
-TEST_F(DefaultSlaveParams, ABadParameterFileStopsTheSlave) {
-    data_.write("params.csv", "h\nMODE,0,Off,EN=0\nMODE,1,On\n");
-    EXPECT_EQ(FAILED, OrvNebu_initialize(SESSION, CTRL));
-    // The data directory as the host hands it out, joined with '/' on every platform.
-    EXPECT_EQ((Strings{"512 Unable to parse file: " + data_.dir() + "params.csv line:3: MODE,1,On",
-                       "32768 Orv abort command"}),
-              said());
-    get(CTRL, {}, FAILED);
-    EXPECT_EQ(0u, OrvRT::OrvNebu_DefaultParamReader::cachedFileCount(SESSION));
-}
-
 TEST_F(DefaultSlaveParams, EachRequestedActionRunsOnceInPriorityOrder) {
     registerRecordingSlave();
     // Two names of one action: it runs once. Choice actions (10000 on) come after.
