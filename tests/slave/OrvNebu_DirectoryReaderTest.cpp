@@ -103,9 +103,12 @@ TEST_F(SlaveChainTest, LinksThatLeadNowhereOrBack) {
     ASSERT_EQ(initialize(5), ORVNEBU_OK);
     ASSERT_EQ(terminate(5), ORVNEBU_OK);
     ORV_SLAVE_REF three = ref(3);
-    EXPECT_EQ(dynamic_cast<OrvNebu_Slave*>(Orv_CoreList::getSlave(HANDLE, &three))->getNextSlave(),
-              nullptr)
-        << "no slave object at the link";
+    OrvNebu_Slave* made = dynamic_cast<OrvNebu_Slave*>(Orv_CoreList::getSlave(HANDLE, &three));
+    EXPECT_EQ(made->getNextSlave(), nullptr) << "no slave object at the link";
+    // The core record and the status word check the host asks of the slave object.
+    const uint32_t* word = made->getCoreInfo().word;
+    EXPECT_EQ(std::vector<uint32_t>(word, word + 5), (std::vector<uint32_t>{1, 0x13, 0, 0, 0}));
+    EXPECT_TRUE(made->initFromStatusWord(0));
     ASSERT_EQ(terminate(3), ORVNEBU_OK);
 
     // Each with slaves one and two further on, which a wrong reading would reach.
