@@ -196,7 +196,8 @@ TEST_F(DocTest, BadInput) {
     std::ofstream(site_ / "index.html", std::ios::app) << "<!-- edited -->\n";
     ASSERT_EQ(run({"doc", DEMO, "-o", out}).status, 0);
     EXPECT_FALSE(has("index.html", "edited"));
-    std::ofstream(site_ / "style.css", std::ios::binary | std::ios::trunc) << "body { color: red }\n";
+    std::ofstream(site_ / "style.css", std::ios::binary | std::ios::trunc)
+        << "body { color: red }\n";
     std::ofstream(root_ / "file") << "x";
     const std::string blocked = (root_ / "file" / "site").string();
     const std::pair<std::vector<std::string>, std::string> cases[] = {

@@ -1,140 +1,76 @@
-// Parameter definition files: the row format, every message, the per-session cache, printing.
-#include <gtest/gtest.h>
-
-#include <atomic>
-#include <cstring>
-#include <filesystem>
-#include <fstream>
+// Parameter definition files: messages, the per-session cache, printing; choice parameters:
+// building, matching register values, listing.
+#include <functional>
 #include <sstream>
 #include <stdexcept>
-#include <string>
-#include <thread>
-#include <vector>
 
 #include "base/Orv_AbortException.h"
-#include "hostsim/Sim.h"
 #include "params/OrvNebu_DefaultParamReader.h"
+#include "support/TempDataDir.h"
 #include "support/TestHost.h"
 
-using OrvRT::Orv_AbortException;
-using OrvRT::OrvNebu_ActionsMap;
-using OrvRT::OrvNebu_DefaultParamReader;
 using OrvRT::OrvNebu_ParamChoiceAction;
+using OrvRT::Orv_AbortException;
+using OrvRT::Orv_HashMapCStr;
+using OrvRT::OrvNebu_ActionsMap;
+using Reader = OrvRT::OrvNebu_DefaultParamReader;
+using Strings = std::vector<std::string>;
 
 namespace {
 
-struct Said {
-    uint32_t handle;
-    uint32_t severity;
-    std::string text;
-    bool operator==(const Said& o) const {
-        return handle == o.handle && severity == o.severity && text == o.text;
-    }
-};
-
-std::ostream& operator<<(std::ostream& os, const Said& m) {
-    return os << "{" << m.handle << ", " << m.severity << ", \"" << m.text << "\"}";
-}
+constexpr uint32_t S = 41, OTHER = 42;
+const char* const MODE_FILE =
+    "h\nMODE,0,Off,EN=0\nMODE,1,On,EN=1,SEL=01\nLEVEL,0,Low,LVL=0000\nLEVEL,1,High,LVL=1111\n";
 
 class ParamReader : public TestHost {
 protected:
-    static constexpr uint32_t SESSION = 41;
-    static constexpr uint32_t OTHER_SESSION = 42;
-
-    void SetUp() override {
-        TestHost::SetUp();
-        dir_ = std::filesystem::temp_directory_path() /
-               ("nebu_params_" + std::to_string(::testing::UnitTest::GetInstance()->random_seed()) +
-                "_" + ::testing::UnitTest::GetInstance()->current_test_info()->name());
-        std::filesystem::create_directories(dir_);
-    }
-
     void TearDown() override {
-        for (uint32_t h : {0u, SESSION, OTHER_SESSION}) OrvSim::endSession(h);
+        for (uint32_t h : {0u, S, OTHER}) OrvSim::endSession(h);
         TestHost::TearDown();
-        std::error_code ec;
-        std::filesystem::remove_all(dir_, ec);
     }
-
-    std::string write(const std::string& name, const std::string& content) {
-        const std::string path = (dir_ / name).string();
-        std::ofstream(path, std::ios::binary) << content;
-        return path;
+    std::string write(const std::string& name, const std::string& text) {
+        data_.write(name, text);
+        return data_.path(name);
     }
-
-    OrvNebu_ActionsMap load(const std::string& path, uint32_t handle = SESSION) {
+    static OrvNebu_ActionsMap load(const std::string& path, uint32_t handle = S) {
         OrvNebu_ActionsMap actions;
-        OrvNebu_DefaultParamReader::addToHashMap(handle, path, actions);
+        Reader::addToHashMap(handle, path, actions);
         return actions;
     }
-
-    static OrvNebu_ParamChoiceAction& choice(OrvNebu_ActionsMap& actions, const std::string& n) {
-        EXPECT_EQ(1u, actions.count(n)) << n;
-        return *static_cast<OrvNebu_ParamChoiceAction*>(actions.at(n));
+    static OrvNebu_ParamChoiceAction& choice(OrvNebu_ActionsMap& a, const char* name) {
+        return *static_cast<OrvNebu_ParamChoiceAction*>(a.at(name));
     }
-
-    Said parseError(const std::string& path, uint32_t line, const std::string& row) {
-        return {SESSION, 512,
-                "Unable to parse file: " + path + " line:" + std::to_string(line) + ": " + row};
-    }
-
-    // Every message so far, with its session.
-    std::vector<Said> said() const {
-        std::vector<Said> all;
-        for (const TestHost::Message& m : messages()) all.push_back({m.handle, m.severity, m.text});
+    // Every message so far as "session severity text"; clears them.
+    Strings said() {
+        Strings all;
+        for (const Message& m : messages())
+            all.push_back(std::to_string(m.handle) + " " + std::to_string(m.severity) + " " +
+                          m.text);
+        clearMessages();
         return all;
     }
-
-    std::filesystem::path dir_;
+    TempDataDir data_;
 };
 
-const char* const MODE_FILE =
-    "param,index,choice,settings\n"
-    "MODE,0,Off,EN=0\n"
-    "MODE,1,On,EN=1,SEL=01\n"
-    "LEVEL,0,Low,LVL=0000\n"
-    "LEVEL,1,High,LVL=1111\n";
+std::string logicErrorOf(const std::function<void()>& f) {
+    try {
+        f();
+    } catch (const std::logic_error& e) {
+        return e.what();
+    }
+    return "<nothing thrown>";
+}
 
 }  // namespace
 
-TEST_F(ParamReader, MalformedRowsAreReportedWithTheirLine) {
-    const char* const ORDER = "choice_index out-of-order";
-    struct Case {
-        std::string content;
-        uint32_t line;
-        std::string row;
-        const char* first;  // the message before the parse error, if any
-    };
-    const std::vector<Case> cases = {
-        {"h\nMODE,0,Off,EN=0\nMODE,1,On\n", 3, "MODE,1,On", nullptr},
-        {"h\nMODE,0,Off,EN=0\nMODE,2,On,EN=1\n", 3, "MODE,2,On,EN=1", ORDER},
-        // The conversion's own message names the bad digits.
-        {"h\nMODE,0,Off,EN=2\n", 2, "MODE,0,Off,EN=2", "2"},
-    };
-    for (const Case& c : cases) {
-        SCOPED_TRACE(c.content);
-        const std::string path = write("bad.csv", c.content);
-        clearMessages();
-        EXPECT_THROW(load(path), Orv_AbortException);
-        std::vector<Said> got = said();
-        ASSERT_EQ(c.first ? 2u : 1u, got.size());
-        if (c.first == ORDER) {
-            EXPECT_EQ((Said{SESSION, 256, ORDER}), got[0]);
-        }
-        if (c.first != nullptr && c.first != ORDER) {
-            EXPECT_EQ(256u, got[0].severity);
-            EXPECT_NE(std::string::npos, got[0].text.find(c.first)) << got[0].text;
-        }
-        EXPECT_EQ(parseError(path, c.line, c.row), got.back());
-        EXPECT_EQ(0u, OrvNebu_DefaultParamReader::cachedFileCount(SESSION));
-    }
+TEST_F(ParamReader, FailuresAreReportedAndCacheNothing) {
+    const std::string bad = write("bad.csv", "h\nMODE,0,Off,EN=0\nMODE,1,On\n");
+    EXPECT_THROW(load(bad), Orv_AbortException);
+    EXPECT_EQ(Strings{"41 512 Unable to parse file: " + bad + " line:3: MODE,1,On"}, said());
+    EXPECT_EQ(0u, Reader::cachedFileCount(S));
     // A failed read caches nothing and is retried.
     EXPECT_EQ(2u, load(write("bad.csv", MODE_FILE)).size());
-}
-
-TEST_F(ParamReader, MissingFileOrDirectory) {
-    for (const std::string& path : {(dir_ / "absent.csv").string(), dir_.string()}) {
-        clearMessages();
+    for (const std::string& path : {data_.path("absent.csv"), data_.dir()}) {
         const std::string text = "Unable to open OrvNebu parameter file: " + path;
         try {
             load(path);
@@ -144,151 +80,126 @@ TEST_F(ParamReader, MissingFileOrDirectory) {
         } catch (const std::logic_error& e) {
             EXPECT_EQ(text, e.what());
         }
-        EXPECT_EQ((std::vector<Said>{{SESSION, 256, text}}), said());
+        EXPECT_EQ(Strings{"41 256 " + text}, said());
     }
-    EXPECT_EQ(0u, OrvNebu_DefaultParamReader::cachedFileCount(SESSION));
-}
-
-TEST_F(ParamReader, HeaderOnlyAndEmptyFilesAreCachedEmpty) {
-    for (const char* content : {"param,index,choice\n", "param,index,choice", ""}) {
-        const std::string path =
-            write(std::string("h") + std::to_string(std::strlen(content)), content);
-        EXPECT_TRUE(load(path).empty());
-    }
+    EXPECT_EQ(1u, Reader::cachedFileCount(S));
+    // A header alone, or nothing at all, is a file without parameters.
+    for (const char* content : {"param,index,choice\n", "param,index,choice", ""})
+        EXPECT_TRUE(load(write(std::to_string(std::string(content).size()), content)).empty());
+    EXPECT_EQ(4u, Reader::cachedFileCount(S));
     EXPECT_NO_MESSAGES();
-    EXPECT_EQ(3u, OrvNebu_DefaultParamReader::cachedFileCount(SESSION));
 }
 
-TEST_F(ParamReader, RepeatedNameKeepsTheFirstAndAMapEntryIsNeverReplaced) {
-    const std::string path = write("rep.csv",
-                                   "h\n"
-                                   "MODE,0,Off,EN=0\n"
-                                   "LEVEL,0,Low,LVL=0\n"
-                                   "MODE,0,Again,EN=1\n");
-    OrvNebu_ActionsMap actions = load(path);
-    EXPECT_NO_MESSAGES();
-    EXPECT_EQ(10002u, choice(actions, "MODE").getPriority());
-    EXPECT_EQ("Off", choice(actions, "MODE").getChoiceList()[0].getChoiceName());
-
-    OrvRT::OrvNebu_ParamChoiceAction mine("LEVEL", 1);
-    OrvNebu_ActionsMap preset{{"LEVEL", &mine}};
-    OrvNebu_DefaultParamReader::addToHashMap(SESSION, path, preset);
-    EXPECT_EQ(&mine, preset.at("LEVEL"));
-    EXPECT_EQ(2u, preset.size());
-}
-
-TEST_F(ParamReader, SharedWithinASessionReadAgainInAnother) {
-    const std::string path = write("p.csv", MODE_FILE);
-    OrvNebu_ActionsMap first = load(path);
-    // Changed on disk: the session keeps what it read, another session reads the new file.
-    write("p.csv", "h\nMODE,0,Only,\n");
-    OrvNebu_ActionsMap second = load(path);
-    EXPECT_EQ(first, second);
-    EXPECT_EQ(2u, choice(second, "MODE").getChoiceList().size());
-
-    const uint64_t registrations = OrvSim::listenerRegistrations();
-    OrvNebu_ActionsMap other = load(path, OTHER_SESSION);
-    EXPECT_EQ(registrations, OrvSim::listenerRegistrations()) << "registered once, not per read";
-    EXPECT_NE(first.at("MODE"), other.at("MODE"));
-    EXPECT_EQ(1u, choice(other, "MODE").getChoiceList().size());
-    EXPECT_EQ(0u, other.count("LEVEL"));
-    EXPECT_EQ(1u, OrvNebu_DefaultParamReader::cachedFileCount(SESSION));
-    EXPECT_EQ(1u, OrvNebu_DefaultParamReader::cachedFileCount(OTHER_SESSION));
-}
-
-TEST_F(ParamReader, SessionEndErasesOnlyThatSession) {
+TEST_F(ParamReader, CachedPerSessionUntilItEnds) {
     const std::string a = write("a.csv", MODE_FILE);
-    const std::string b = write("b.csv", "h\nB,0,x,\n");
-    load(a);
-    load(b);
-    load(a, OTHER_SESSION);
-    std::ostringstream sink;
-    OrvNebu_DefaultParamReader::readAndPrint(a, sink);
-    EXPECT_EQ(2u, OrvNebu_DefaultParamReader::cachedFileCount(SESSION));
-    EXPECT_EQ(1u, OrvNebu_DefaultParamReader::cachedFileCount(0));
-
-    OrvSim::endSession(SESSION);
-    EXPECT_EQ(0u, OrvNebu_DefaultParamReader::cachedFileCount(SESSION));
-    EXPECT_EQ(1u, OrvNebu_DefaultParamReader::cachedFileCount(OTHER_SESSION));
-    EXPECT_EQ(1u, OrvNebu_DefaultParamReader::cachedFileCount(0));
-
-    // The next use reads the file afresh.
-    write("a.csv", "h\nNEW,0,x,\n");
-    OrvNebu_ActionsMap again = load(a);
-    EXPECT_EQ(1u, again.count("NEW"));
-    EXPECT_EQ(1u, load(a, OTHER_SESSION).count("MODE"));
-}
-
-TEST_F(ParamReader, TheCacheRegistersAgainWithAHostThatForgotIt) {
-    const std::string a = write("a.csv", MODE_FILE);
+    // A new host knows no listener: the first file cached registers again.
     for (int host = 0; host < 2; ++host) {
-        OrvSim::resetHost();  // a new host knows no listener
+        OrvSim::resetHost();
         load(a);
-        OrvSim::endSession(SESSION);
-        EXPECT_EQ(0u, OrvNebu_DefaultParamReader::cachedFileCount(SESSION)) << "host " << host;
+        OrvSim::endSession(S);
+        EXPECT_EQ(0u, Reader::cachedFileCount(S)) << "host " << host;
     }
+    load(write("b.csv", "h\nB,0,x,\n"));
+    OrvNebu_ActionsMap first = load(a);
+    write("a.csv", "h\nMODE,0,Only,\n");
+    const uint64_t registrations = OrvSim::listenerRegistrations();
+    OrvNebu_ActionsMap other = load(a, OTHER);
+    EXPECT_EQ(registrations, OrvSim::listenerRegistrations()) << "registered once, not per read";
+    EXPECT_EQ(1u, choice(other, "MODE").getChoiceList().size());
+    EXPECT_EQ(1u, other.size());
+    std::ostringstream sink;
+    Reader::readAndPrint(a, sink);
+    EXPECT_EQ(2u, Reader::cachedFileCount(S));
+    EXPECT_EQ(1u, Reader::cachedFileCount(0));
+
+    OrvSim::endSession(S);
+    EXPECT_EQ(0u, Reader::cachedFileCount(S));
+    EXPECT_EQ(1u, Reader::cachedFileCount(OTHER));
+    EXPECT_EQ(1u, Reader::cachedFileCount(0));
+    // The next use reads the file afresh; the other session still has its own.
+    EXPECT_EQ(1u, choice(first = load(a), "MODE").getChoiceList().size());
+    EXPECT_EQ(other, load(a, OTHER));
 }
 
 TEST_F(ParamReader, PrintsTheFileBackAndAgainFromTheCache) {
     const std::string path = write("p.csv",
-                                   "Param,Index,Choice,Settings\r\n"
-                                   "MODE,0,Off,EN=0\n"
-                                   "\"MODE\",1,On,EN=1,,SEL=01\n"
-                                   "WIDE,0,w,R=000101\n"
-                                   "WIDE,1,v,R=11\n"
+                                   "Param,Index,Choice,Settings\r\nMODE,0,Off,EN=0,ZZ=\n"
+                                   "\"MODE\",1,On,EN=1,,SEL=01\nWIDE,0,w,R=000101\nWIDE,1,v,R=11\n"
                                    "EMPTY,0,none,\n");
     const std::string image =
-        "Param,Index,Choice,Settings\n"
-        "MODE,0,Off,EN=0\n"
-        "MODE,1,On,EN=1,SEL=01\n"
-        "WIDE,0,w,R=000101\n"
-        "WIDE,1,v,R=000011\n"
-        "EMPTY,0,none\n";
-    std::ostringstream out;
-    OrvNebu_DefaultParamReader::readAndPrint(path, out);
-    EXPECT_EQ(image, out.str());
+        "Param,Index,Choice,Settings\nMODE,0,Off,EN=0,ZZ=\nMODE,1,On,EN=1,SEL=01\n"
+        "WIDE,0,w,R=000101\nWIDE,1,v,R=000011\nEMPTY,0,none\n";
+    for (int pass = 0; pass < 2; ++pass) {
+        std::ostringstream out;
+        Reader::readAndPrint(path, out);
+        EXPECT_EQ(image, out.str()) << "pass " << pass;
+        // Printed from the cache (session 0): the file is not read again.
+        write("p.csv", "Other\nX,0,y,\n");
+    }
     EXPECT_NO_MESSAGES();
-
-    // Printed from the cache (session 0): the file is not read again, the header is kept.
-    write("p.csv", "Other\nX,0,y,\n");
-    std::ostringstream again;
-    OrvNebu_DefaultParamReader::readAndPrint(path, again);
-    EXPECT_EQ(image, again.str());
-
     // Failures are reported on session 0.
-    clearMessages();
     const std::string bad = write("bad.csv", "h\nM,0,a\n");
     std::ostringstream none;
-    EXPECT_THROW(OrvNebu_DefaultParamReader::readAndPrint(bad, none), Orv_AbortException);
-    EXPECT_EQ((std::vector<Said>{{0, 512, "Unable to parse file: " + bad + " line:2: M,0,a"}}),
-              said());
+    EXPECT_THROW(Reader::readAndPrint(bad, none), Orv_AbortException);
+    EXPECT_EQ(Strings{"0 512 Unable to parse file: " + bad + " line:2: M,0,a"}, said());
 }
 
-TEST_F(ParamReader, SessionsMayReadAndEndAtTheSameTime) {
-    // Each session is serialised by its own target lock only: one session may read a file
-    // into the cache while the host ends another.
-    const std::string path = write("p.csv", MODE_FILE);
-    constexpr uint32_t FIRST = 5000;
-    constexpr uint32_t COUNT = 400;
-    // The host ends only sessions whose calls have returned.
-    std::atomic<uint32_t> finished(0);
-    std::atomic<bool> done(false);
-    std::thread ender([&] {
-        for (uint32_t k = 0; !done; ++k) {
-            const uint32_t n = finished;
-            if (n != 0) OrvSim::endSession(FIRST + k % n);
-        }
-    });
-    size_t loaded = 0;
-    for (uint32_t i = 0; i < COUNT; ++i) {
-        loaded += load(path, FIRST + i).size();
-        finished = i + 1;
+TEST(ParamChoiceAction, ChoiceIndexesMustRunInOrder) {
+    OrvNebu_ParamChoiceAction a("P", 10002);
+    // A setting before any choice has no last choice to go to.
+    EXPECT_EQ("choice_index corrupt",
+              logicErrorOf([&] { a.addChoiceRegSetting(0xFFFFFFFFu, 1, "R", "1"); }));
+    EXPECT_EQ("choice_index corrupt", logicErrorOf([&] { a.addChoiceRegSetting(0, 1, "R", "1"); }));
+    EXPECT_EQ("choice_index out-of-order", logicErrorOf([&] { a.addChoice("B", 1); }));
+    EXPECT_TRUE(a.getChoiceList().empty());
+
+    a.addChoice("A", 0);
+    EXPECT_EQ("choice_index out-of-order", logicErrorOf([&] { a.addChoice("A2", 0); }));
+    a.addChoice("B", 1);
+    EXPECT_EQ("choice_index corrupt", logicErrorOf([&] { a.addChoiceRegSetting(0, 4, "R", "F"); }));
+    EXPECT_EQ("choice_index corrupt", logicErrorOf([&] { a.addChoiceRegSetting(2, 4, "R", "F"); }));
+    // The failed calls left nothing behind.
+    ASSERT_EQ(2u, a.getChoiceList().size());
+    EXPECT_TRUE(a.getChoiceList()[0].getRegValueList().empty());
+    EXPECT_TRUE(a.getChoiceList()[1].getRegValueList().empty());
+    EXPECT_EQ(0u, a.getRegWidth("R"));
+
+    a.addChoiceRegSetting(1, 4, "R", "F");
+    EXPECT_EQ(4u, a.getRegWidth("R"));
+    // Asking for a register no choice sets does not make it one to read.
+    EXPECT_EQ(0u, a.getRegWidth("UNKNOWN"));
+    OrvRT::Orv_HashMapCStr registers;
+    a.getRegsToRead(registers);
+    EXPECT_EQ((OrvRT::Orv_HashMapCStr{{"R", ""}}), registers);
+}
+
+TEST(ParamChoiceAction, HexValueComparison) {
+    struct Case {
+        const char* a;
+        const char* b;
+        bool equal;
+    };
+    const Case cases[] = {{"0x001F", "1f", true}, {"0x001F", "001F", true}, {"1f", "001F", true},
+                          {"0X1f", "0x1F", true}, {"0", "", true},          {"0x0", "", true},
+                          {"000", "0", true},     {"0x", "", true},         {"1", "01", true},
+                          {"1", "10", false},     {"1f", "1e", false},      {" 1", "1", false},
+                          {"0x0x1", "1", false},  {"00x1", "1", false},     {"ABC", "abc", true},
+                          {"0x12", "12", true}};
+    for (const Case& c : cases) {
+        SCOPED_TRACE(std::string(c.a) + " vs " + c.b);
+        EXPECT_EQ(c.equal, OrvNebu_ParamChoiceAction::hexValuesEqual(c.a, c.b));
+        EXPECT_EQ(c.equal, OrvNebu_ParamChoiceAction::hexValuesEqual(c.b, c.a));
     }
-    done = true;
-    ender.join();
-    EXPECT_EQ(2u * COUNT, loaded);
-    for (uint32_t i = 0; i < COUNT; ++i) OrvSim::endSession(FIRST + i);
-    for (uint32_t i = 0; i < COUNT; ++i) {
-        ASSERT_EQ(0u, OrvNebu_DefaultParamReader::cachedFileCount(FIRST + i));
-    }
+}
+
+// The board-level engine tests cover the common cases; these are the corners.
+
+TEST(ParamChoiceAction, WithoutChoicesItReadsEmptyAndListsNone) {
+    OrvNebu_ParamChoiceAction none("N", 10002);
+    Orv_HashMapCStr registers, params{{"N", "stale"}};
+    none.readRegsAndUpdateParams(false, registers, params);
+    EXPECT_EQ((Orv_HashMapCStr{{"N", ""}}), params);
+    std::vector<std::string> choices{"left", "over"};
+    none.getChoices(nullptr, choices);
+    EXPECT_TRUE(choices.empty());
 }

@@ -1,21 +1,16 @@
-// The directory file: header rules, number bases of the key columns, first match wins, and
-// each failure with its messages as OrvNebu_initialize reports them.
-#include <memory>
-#include <typeinfo>
-
+// The directory file as the plug-in looks a slave up in it, the table of slave classes, and
+// the chain of slaves along next_slave, loops included.
+#include "base/OrvNebu_SlaveClassTable.h"
+#include "base/Orv_AbortException.h"
+#include "host/OrvCore.h"
 #include "slave/OrvNebu_DefaultSlave.h"
 #include "slave/OrvNebu_DirectoryReader.h"
-#include "slave/OrvNebu_SlaveFactory.h"
 #include "support/RegsFixture.h"
-#include "transceiver/OrvNebu_TransceiverClasses.h"
-#include "transceiver/OrvNebu_VanduM3Qrc.h"
-#include "transceiver/OrvNebu_VanduR2Qra.h"
-#include "transceiver/OrvNebu_VanduR3Qra.h"
-#include "transceiver/OrvNebu_VanduR3Qrb.h"
 
+using OrvRT::Orv_CoreList;
 using OrvRT::Orv_HashMapCStr;
-using OrvRT::OrvNebu_DirectoryReader;
-using OrvRT::OrvNebu_SlaveFactory;
+using OrvRT::OrvNebu_DefaultSlave;
+using OrvRT::OrvNebu_Slave;
 
 namespace {
 
@@ -24,189 +19,116 @@ protected:
     // Looks up type and version in a directory file with this text.
     bool lookup(const std::string& text, int32_t type, int32_t version, Orv_HashMapCStr& entry) {
         data_.write("dir.csv", text);
-        return OrvNebu_DirectoryReader::getEntry(HANDLE, data_.path("dir.csv"), type, version,
-                                                 entry);
-    }
-    std::string registersFor(const std::string& text, int32_t type, int32_t version) {
-        Orv_HashMapCStr entry;
-        if (!lookup(text, type, version, entry)) return "<none>";
-        return entry["registers"];
-    }
-
-    // Initializes slave 0 (type 0x11, version 1) against a directory file with this text.
-    uint32_t initializeWith(const std::string& directory) {
-        data_.write("orvnebu_directory.csv", directory);
-        clearMessages();
-        return initialize(0);
+        return OrvRT::OrvNebu_DirectoryReader::getEntry(HANDLE, data_.path("dir.csv"), type,
+                                                        version, entry);
     }
 };
 
-TEST_F(DirectoryReaderTest, HeaderKeyColumnsAndLines) {
+TEST_F(DirectoryReaderTest, HeaderNamesInAnyCaseAndTheFiveKeyColumns) {
+    const std::string file =
+        " Slave_Type ,ORV_DRV_VER_MIN,orv_drv_ver_max,parameters,Registers\r\n0x11,1,2,P,R\r\n";
     Orv_HashMapCStr entry;
-    ASSERT_TRUE(
-        lookup(" Slave_Type ,ORV_DRV_VER_MIN,orv_drv_ver_max,Registers,parameters\n"
-               "0x11,1,2,R.csv,P.csv\n",
-               0x11, 1, entry));
+    ASSERT_TRUE(lookup(file, 0x11, 2, entry));
     EXPECT_EQ(entry, (Orv_HashMapCStr{{"slave_type", "0x11"},
                                       {"orv_drv_ver_min", "1"},
                                       {"orv_drv_ver_max", "2"},
-                                      {"registers", "R.csv"},
-                                      {"parameters", "P.csv"}}));
-    const std::string h = "slave_type,orv_drv_ver_min,orv_drv_ver_max,registers,parameters\n";
-    const struct {
-        std::string text;
-        int32_t type, version;
-        const char* registers;
-    } rows[] = {
-        // Key columns anywhere; values taken as they stand; the leftmost of a twice column.
-        {"registers,x,orv_drv_ver_max,orv_drv_ver_min,slave_type\n R.csv ,,9,1,17\n", 17, 5,
-         " R.csv "},
-        {"registers,slave_type,orv_drv_ver_min,orv_drv_ver_max,registers\nl.csv,1,1,1,r.csv\n", 1,
-         1, "l.csv"},
-        // Hexadecimal keys; the version range is inclusive at both ends.
-        {h + "0x15,1,0xFFFF,hex.csv,\n", 21, 7, "hex.csv"},
-        {h + "1,2,4,r.csv,\n", 1, 2, "r.csv"},
-        {h + "1,2,4,r.csv,\n", 1, 4, "r.csv"},
-        {h + "1,2,4,r.csv,\n", 1, 1, "<none>"},
-        {h + "1,2,4,r.csv,\n", 1, 5, "<none>"},
-        // First match wins, lines too short for the keys are skipped, extra fields ignored.
-        {"a,b,slave_type,orv_drv_ver_min,orv_drv_ver_max,registers\n"
-         "x,y,1,1\nx,y,1,1,1,first.csv,extra\nx,y,1,1,1,second.csv\n",
-         1, 1, "first.csv"},
-        {"slave_type,orv_drv_ver_min,orv_drv_ver_max,parameters,registers\r\n1,1,1,,r.csv\r\n", 1,
-         1, "r.csv"},
-        // Ctrl-Z, the end of a text file to old Windows programs, is a character like any other.
-        {h + "2,1,1,\x1a.csv,\n1,1,1,after.csv,\n", 1, 1, "after.csv"},
-    };
-    for (const auto& row : rows) {
-        EXPECT_EQ(registersFor(row.text, row.type, row.version), row.registers) << row.text;
-    }
-    // A line shorter than the header delivers what it has.
-    entry.clear();
-    ASSERT_TRUE(lookup(h + "1,1,1\n", 1, 1, entry));
-    EXPECT_EQ(entry.size(), 3u);
-    EXPECT_NO_MESSAGES();
-}
-
-TEST_F(DirectoryReaderTest, UnusableHeaderIsReportedAndAborts) {
-    const std::string path = data_.path("orvnebu_directory.csv");
+                                      {"registers", "R"},
+                                      {"parameters", "P"}}));
+    EXPECT_FALSE(lookup(file, 0x11, 3, entry));
+    // A header without all five key columns, or none at all, is refused.
     for (const char* text :
-         {"slave_type,orv_drv_ver_min,orv_drv_ver_max,registers\n0x11,1,1,regs.csv\n",
-          "slave_type,orv_drv_ver_min,registers,parameters,other\n0x11,1,regs.csv,,\n", ""}) {
-        EXPECT_EQ(initializeWith(text), ORVNEBU_FAILED) << text;
-        auto m = messages();
-        ASSERT_EQ(m.size(), 2u) << text;
-        EXPECT_EQ(m[0].severity, 256u);
-        EXPECT_EQ(m[0].text, "Unable to parse header of CSV file: " + path);
-        EXPECT_EQ(m[1].severity, 32768u);
-        EXPECT_EQ(m[1].text, "Orv abort command");
+         {"slave_type,orv_drv_ver_min,orv_drv_ver_max,registers\n1,1,1,r\n", ""}) {
+        clearMessages();
+        EXPECT_THROW(lookup(text, 1, 1, entry), OrvRT::Orv_AbortException) << text;
+        EXPECT_LAST_MESSAGE(256, "Unable to parse header of CSV file: " + data_.path("dir.csv"));
     }
-}
-
-TEST_F(DirectoryReaderTest, MissingFileAndMissingEntry) {
-    setDataDir(data_.path("nowhere"));
-    clearMessages();
-    EXPECT_EQ(initialize(0), ORVNEBU_FAILED);
-    auto m = messages();
-    ASSERT_EQ(m.size(), 2u);
-    EXPECT_EQ(m[0].severity, 256u);
-    EXPECT_EQ(m[0].text, "Unable to open " + data_.path("nowhere") + "/orvnebu_directory.csv");
-    EXPECT_EQ(m[1].severity, 32768u);
-
-    setDataDir(data_.dir());
-
-    EXPECT_EQ(initializeWith("slave_type,orv_drv_ver_min,orv_drv_ver_max,registers,parameters\n"
-                             "0x11,2,3,regs.csv,\n"
-                             "0x11,1,1,,\n"),
-              ORVNEBU_FAILED);
-    m = messages();
-    ASSERT_EQ(m.size(), 1u);
-    EXPECT_EQ(m[0].severity, 256u);
-    EXPECT_EQ(m[0].text,
-              "No OrvNebu register file specified for OrvNebu slave type: 17, orv driver "
-              "version: 1");
 }
 
 TEST_F(DirectoryReaderTest, RegisterFileNameKeepsItsBlanks) {
-    EXPECT_EQ(initializeWith("slave_type,orv_drv_ver_min,orv_drv_ver_max,registers,parameters\n"
-                             "0x11,1,1, regs.csv,\n"),
-              ORVNEBU_FAILED);
-    EXPECT_MESSAGE(256, "Unable to open OrvNebu register file: " + data_.dir() + " regs.csv");
-    // Windows would open regs.csv for these names: the plug-in does not, there either.
-    for (const std::string name : {"regs.csv  ", "regs.csv."}) {
-        EXPECT_EQ(initializeWith("slave_type,orv_drv_ver_min,orv_drv_ver_max,registers,parameters\n"
-                                 "0x11,1,1," +
-                                 name + ",\n"),
-                  ORVNEBU_FAILED);
+    // Windows would open regs.csv for the last two names: the plug-in does not, there either.
+    for (const std::string name : {" regs.csv", "regs.csv  ", "regs.csv."}) {
+        data_.write("orvnebu_directory.csv",
+                    "slave_type,orv_drv_ver_min,orv_drv_ver_max,registers,parameters\n0x11,1,1," +
+                        name + ",\n");
+        EXPECT_EQ(initialize(0), ORVNEBU_FAILED);
         EXPECT_MESSAGE(256, "Unable to open OrvNebu register file: " + data_.dir() + name);
     }
 }
 
-// The class of the slave a creation function builds from the demo files of that class.
-class SlaveFactoryRecords : public TestHost {
+TEST(SlaveClassTable, FourteenRecordsSortedWithTheirVersionRanges) {
+    using T = OrvRT::OrvNebu_SlaveClassTable;
+    const T::Record expected[14] = {
+        {0x00, 0, 0xFFFF, T::DEFAULT_SLAVE}, {0x01, 1, 1, T::VANDU_M3QRC},
+        {0x11, 1, 0xFFFF, T::DEFAULT_SLAVE}, {0x12, 1, 0xFFFF, T::DEFAULT_SLAVE},
+        {0x13, 1, 0xFFFF, T::DEFAULT_SLAVE}, {0x14, 1, 0xFFFF, T::DEFAULT_SLAVE},
+        {0x15, 1, 0xFFFF, T::VANDU_R3QRA},   {0x21, 1, 0xFFFF, T::DEFAULT_SLAVE},
+        {0x31, 1, 0xFFFF, T::DEFAULT_SLAVE}, {0x41, 1, 1, T::DEFAULT_SLAVE},
+        {0x42, 1, 1, T::VANDU_R2QRA},        {0x43, 1, 1, T::VANDU_R3QRA},
+        {0x44, 1, 1, T::VANDU_M3QRC},        {0x45, 1, 1, T::VANDU_R3QRB}};
+    const std::vector<T::Record>& r = T::records();
+    ASSERT_EQ(r.size(), 14u);
+    for (size_t i = 0; i < r.size(); ++i) {
+        SCOPED_TRACE(i);
+        EXPECT_EQ(r[i].slaveType, expected[i].slaveType);
+        EXPECT_EQ(r[i].minDriverVersion, expected[i].minDriverVersion);
+        EXPECT_EQ(r[i].maxDriverVersion, expected[i].maxDriverVersion);
+        EXPECT_EQ(r[i].slaveClass, expected[i].slaveClass);
+        // Found at both ends of its own range.
+        EXPECT_EQ(T::find(r[i].slaveType, r[i].minDriverVersion), r[i].slaveClass);
+        EXPECT_EQ(T::find(r[i].slaveType, r[i].maxDriverVersion), r[i].slaveClass);
+    }
+    // Outside every record: the default slave.
+    for (const auto& u : std::vector<std::pair<int32_t, int32_t>>{
+             {0x44, 2}, {0x42, 2}, {0x01, 0}, {0x41, 2}, {0x99, 1}})
+        EXPECT_EQ(T::find(u.first, u.second), T::DEFAULT_SLAVE) << u.first << " " << u.second;
+}
+
+class SlaveChainTest : public RegsFixture {
 protected:
-    std::string built(OrvNebu_SlaveFactory::CreateFunction create, const std::string& files) {
-        const std::string base = std::string(NEBU_TEST_DATA_DIR) + "/" + files;
-        std::unique_ptr<OrvRT::OrvNebu_Slave> slave(
-            create(HANDLE, ORV_CORE_INFO{{1, 0, 0, 0, 0}}, ORV_SLAVE_REF{0, 1, 0},
-                   Orv_HashMapCStr(), base + "_regs.csv", base + "_params.csv"));
-        return slave ? typeid(*slave).name() : "<none>";
+    // Registers a slave object at the index with this next_slave text (none when null).
+    OrvNebu_Slave* addSlave(uint32_t index, const char* nextSlave) {
+        Orv_HashMapCStr info{{"slave_type", "19"}, {"orv_drv_ver", "1"}};
+        if (nextSlave != nullptr) info["next_slave"] = nextSlave;
+        ORV_CORE_INFO coreInfo{{1, 0x13, 0, 0, 0}};
+        OrvNebu_Slave* s = OrvNebu_DefaultSlave::create(HANDLE, coreInfo, ref(index), info,
+                                                        data_.path("chain.csv"), "");
+        if (s != nullptr) Orv_CoreList::addCore(HANDLE, s);
+        return s;
     }
 };
 
-TEST_F(SlaveFactoryRecords, FourteenRecordsSortedWithTheirVersionRangesAndClasses) {
-    using Table = OrvRT::OrvNebu_SlaveClassTable;
-    const OrvNebu_SlaveFactory::SlaveClasses& classes =
-        OrvRT::OrvNebu_TransceiverClasses::slaveClasses();
-    auto find = [&classes](int32_t type, int32_t version) {
-        return OrvNebu_SlaveFactory::findCreateFunction(type, version, classes);
-    };
-    const std::string plain = typeid(OrvRT::OrvNebu_DefaultSlave).name();
-    const std::string m3qrc = typeid(OrvRT::OrvNebu_VanduM3Qrc).name();
-    const std::string r2qra = typeid(OrvRT::OrvNebu_VanduR2Qra).name();
-    const std::string r3qra = typeid(OrvRT::OrvNebu_VanduR3Qra).name();
-    const std::string r3qrb = typeid(OrvRT::OrvNebu_VanduR3Qrb).name();
-    const struct {
-        int32_t type, min, max;
-        std::string cls;
-        const char* files;  // demo files the class can read
-    } expected[14] = {{0x00, 0, 0xFFFF, plain, "ctrl"},        {0x01, 1, 1, m3qrc, "vandu_m3qrc"},
-                      {0x11, 1, 0xFFFF, plain, "ctrl"},        {0x12, 1, 0xFFFF, plain, "ctrl"},
-                      {0x13, 1, 0xFFFF, plain, "ctrl"},        {0x14, 1, 0xFFFF, plain, "ctrl"},
-                      {0x15, 1, 0xFFFF, r3qra, "vandu_r3qra"}, {0x21, 1, 0xFFFF, plain, "ctrl"},
-                      {0x31, 1, 0xFFFF, plain, "ctrl"},        {0x41, 1, 1, plain, "ctrl"},
-                      {0x42, 1, 1, r2qra, "vandu_r2qra"},      {0x43, 1, 1, r3qra, "vandu_r3qra"},
-                      {0x44, 1, 1, m3qrc, "vandu_m3qrc"},      {0x45, 1, 1, r3qrb, "vandu_r3qrb"}};
-    // The factory's table, with the creation functions the layer above enters.
-    const std::vector<Table::Record>& r = Table::records();
-    ASSERT_EQ(r.size(), 14u);
-    for (size_t i = 0; i < r.size(); ++i) {
-        EXPECT_EQ(r[i].slaveType, expected[i].type) << i;
-        EXPECT_EQ(r[i].minDriverVersion, expected[i].min) << i;
-        EXPECT_EQ(r[i].maxDriverVersion, expected[i].max) << i;
-        const OrvNebu_SlaveFactory::CreateFunction create = classes.create[r[i].slaveClass];
-        EXPECT_EQ(built(create, expected[i].files), expected[i].cls) << i;
-        // The table names the class that is built (the file tools read the name).
-        EXPECT_NE(expected[i].cls.find(Table::info(r[i].slaveClass).className), std::string::npos)
-            << i;
-        // Every record is found for its own range, and only for it.
-        EXPECT_EQ(find(r[i].slaveType, r[i].minDriverVersion), create);
-        EXPECT_EQ(find(r[i].slaveType, r[i].maxDriverVersion), create);
+// The demo chain of duals is in the transceiver_slaves transcript; here the links it lacks.
+TEST_F(SlaveChainTest, LinksThatLeadNowhereOrBack) {
+    ASSERT_EQ(initialize(3), ORVNEBU_OK);  // next_slave 2
+    ASSERT_EQ(initialize(5), ORVNEBU_OK);
+    ASSERT_EQ(terminate(5), ORVNEBU_OK);
+    ORV_SLAVE_REF three = ref(3);
+    OrvNebu_Slave* made = dynamic_cast<OrvNebu_Slave*>(Orv_CoreList::getSlave(HANDLE, &three));
+    EXPECT_EQ(made->getNextSlave(), nullptr) << "no slave object at the link";
+    // The core record and the status word check the host asks of the slave object.
+    const uint32_t* word = made->getCoreInfo().word;
+    EXPECT_EQ(std::vector<uint32_t>(word, word + 5), (std::vector<uint32_t>{1, 0x13, 0, 0, 0}));
+    EXPECT_TRUE(made->initFromStatusWord(0));
+    ASSERT_EQ(terminate(3), ORVNEBU_OK);
+
+    // Each with slaves one and two further on, which a wrong reading would reach.
+    uint32_t index = 10;
+    for (const char* text : {(const char*)nullptr, "", "0", "abc", " 0x2"}) {
+        OrvNebu_Slave* s = addSlave(index, text);
+        addSlave(index + 1, nullptr);
+        addSlave(index + 2, nullptr);
+        EXPECT_EQ(s->getNextSlave(), nullptr) << (text ? text : "(absent)");
+        index += 3;
     }
-    // Outside every record the default slave is built, whatever files come with it.
-    const struct {
-        int32_t type, version;
-        const char* files;
-    } uncovered[] = {{0x44, 2, "vandu_m3qrc"},
-                     {0x42, 2, "vandu_r2qra"},
-                     {0x01, 0, "vandu_m3qrc"},
-                     {0x41, 2, "ctrl"},
-                     {0x99, 1, "ctrl"}};
-    for (const auto& u : uncovered) {
-        EXPECT_EQ(built(find(u.type, u.version), u.files), plain) << u.type << " " << u.version;
-    }
-    EXPECT_EQ(built(find(0x15, 7), "vandu_r3qra"), r3qra);
-    EXPECT_TRUE(noMessages());
+    OrvNebu_Slave* a = addSlave(3, "2");
+    OrvNebu_Slave* b = addSlave(5, "-2");
+    OrvNebu_Slave* c = addSlave(6, " +0");
+    EXPECT_EQ(a->getNextSlave(), b);
+    EXPECT_EQ(b->getNextSlave(), a);
+    EXPECT_EQ(a->getPreviousSlave(), b);
+    EXPECT_EQ(b->getPreviousSlave(), a);
+    EXPECT_EQ(c->getPreviousSlave(), nullptr);
+    EXPECT_EQ(a->getParamFromOtherSlave(nullptr, "refclk", "GREFCLK"), "GREFCLK");
 }
 
 }  // namespace
