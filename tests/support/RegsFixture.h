@@ -8,7 +8,6 @@
 #include <vector>
 
 #include "orvnebu/orvnebu.h"
-#include "support/BusTransfers.h"
 #include "support/TempDataDir.h"
 #include "support/TestHost.h"
 
@@ -93,7 +92,6 @@ protected:
         clearMessages();
         stats();
     }
-    std::vector<BusTransfer> transfers() const { return decodeTransfers(trace()); }
 
     TempDataDir data_;
 };

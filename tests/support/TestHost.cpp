@@ -3,21 +3,6 @@
 
 #include "host/OrvCore.h"
 
-const char* const TestHost::BUS_BOARD = R"({
-  "devices": [
-    { "chains": {
-        "1": { "cores": [
-          { "type": 3 },
-          { "type": 14,
-            "master": { "slaveCount": 4, "periodInt": 10, "periodFrc": 0, "dclkHasReset": true,
-              "slaves": {
-                "0": { "slaveType": "0x11", "driverVersion": 1 },
-                "1": { "slaveType": "0x12", "driverVersion": 1,
-                       "memory": { "0x0010": "0x1234" } } } } } ] },
-        "2": { "cores": [] } } },
-    { "trellom": true, "chains": { "1": { "cores": [ { "type": 14, "master": { "slaveCount": 1 } } ] } } }
-  ] })";
-
 void TestHost::SetUp() {
     OrvSim::resetHost();
     OrvSim::setMessageSink([this](uint32_t handle, uint32_t severity, const std::string& text) {
@@ -51,15 +36,6 @@ std::vector<TestHost::Message> TestHost::messages() const {
 void TestHost::clearMessages() {
     std::lock_guard<std::mutex> guard(mutex_);
     messages_.clear();
-}
-
-TestHost::Message TestHost::lastMessage() const {
-    std::lock_guard<std::mutex> guard(mutex_);
-    if (messages_.empty()) {
-        ADD_FAILURE() << "no session message was received";
-        return Message{0, 0, std::string()};
-    }
-    return messages_.back();
 }
 
 namespace {

@@ -26,14 +26,6 @@ public:
     };
 
     static constexpr uint32_t HANDLE = 1;  // the session tests use unless they say otherwise
-    static constexpr uint32_t SEVERITY_ERROR = 256;
-    static constexpr uint32_t SEVERITY_FILE_LINE = 512;
-    static constexpr uint32_t SEVERITY_ABORT = 32768;
-
-    // Device 0: chain 1 holds a plain core and a bus master with 4 slave positions, slaves
-    // 0 and 1 present (slave 1 has a word 0x1234 at 0x0010); chain 2 has no cores.
-    // Device 1: a configuration-controller device.
-    static const char* const BUS_BOARD;
 
 protected:
     void SetUp() override;
@@ -48,8 +40,6 @@ protected:
     // Session messages received so far, in order (every session).
     std::vector<Message> messages() const;
     void clearMessages();
-    // The last message; fails the test and returns an empty one when there is none.
-    Message lastMessage() const;
     // Whether a message with that severity and exactly that text was received.
     ::testing::AssertionResult hasMessage(uint32_t severity, const std::string& text) const;
     // Whether the last message has that severity and exactly that text.

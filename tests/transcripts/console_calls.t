@@ -9,6 +9,24 @@ slaveHandles=
 message 256: OrvNebu_getBusErrorStatus() argument checking failed:(errorStatus != 0) && (errorStatusLen != 0)
 rc=0x80000000
 errorStatus=
+# A burst of two words; an empty position read sets the bus error bit, which the next status
+# and the error status of all eight positions show.
+> burstSlaveWrite 0 1 1 0x0100 1 0x1111 0x2222
+rc=0x00000000
+status=0
+> singleSlaveRead 0 1 7 0
+rc=0x00000000
+buffer=0x0000
+status=1
+> burstSlaveRead 0 1 0 0 1 1
+rc=0x00000000
+buffer=0x0001
+status=1
+> getBusErrorStatus 0 1 8
+rc=0x00000000
+errorStatus=1 1 1 1 1 1 1 1
+> clearBusErrorStatus 0 1
+rc=0x00000000
 > burstSlaveRead 0 1 2 3 1 0
 message 256: OrvNebu_burstSlaveRead() argument checking failed:(buffer != 0) && (numRead != 0)
 rc=0x80000000
