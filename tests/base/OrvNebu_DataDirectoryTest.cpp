@@ -325,6 +325,10 @@ TEST(DefinitionFiles, ProblemsWherePlacedAndWhatIsKept) {
          "1:0:0 the header has no registers column: no slave can be created\n"
          "rows 2:1:1-1::",
          "rows 2:1:1-1::"},
+        {'d', "slave_type,orv_drv_ver_min,a,b,c\n",
+         "1:0:256 Unable to parse header of CSV file: F: it has no orv_drv_ver_max column +256\n"
+         "rows",
+         SAME},
         {'d', "a\n",
          "1:0:256 Unable to parse header of CSV file: F: it has 1 column, at least 5 are needed "
          "+256\n"

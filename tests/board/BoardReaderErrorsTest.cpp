@@ -36,15 +36,8 @@ TEST(BoardReaderErrors, MessagesNameTheFileThePlaceAndTheProblem) {
         {"{}", "boards/x.json: \"devices\" is missing"},
         {R"({"devices": [], "boards": 1})",
          "boards/x.json: boards: unknown key (known keys: devices)"},
-        {R"({"devices": [{}, {"colour": 1}]})",
-         "boards/x.json: devices[1].colour: unknown key (known keys: trellom, chains)"},
-        {R"({"devices": [{"chains": {"1": {}, "0x1": {}}}]})",
-         "boards/x.json: devices[0].chains.1: chain 1 is given twice"},
         {R"({"devices": [{"chains": {"1": {"cores": [{"type": -3}]}}}]})",
          "boards/x.json: devices[0].chains.1.cores[0].type: -3 is out of range 0..4294967295"},
-        {R"({"devices": [{"chains": {"1": {"cores": [{"type": "14 "}]}}}]})",
-         "boards/x.json: devices[0].chains.1.cores[0].type: \"14 \" is not a decimal or 0x "
-         "hexadecimal number"},
         {R"({"devices": [{"chains": {"1": {"cores": [{"type": 3, "failingCommands": [1, 8]}]}}}]})",
          "boards/x.json: devices[0].chains.1.cores[0].failingCommands[1]: 8 is out of range 1..7"},
         {withMaster(R"("slaveCount": 300)"), M + "slaveCount: 300 is out of range 0..255"},
@@ -52,11 +45,6 @@ TEST(BoardReaderErrors, MessagesNameTheFileThePlaceAndTheProblem) {
          M + "slaves.2: slave index 2 is not below slaveCount 2"},
         {withMaster(R"("slaveCount": 2, "slaves": {"1": {}, "0x1": {}})"),
          M + "slaves.1: slave 1 is given twice"},
-        {withMaster(R"("slaveCount": 1, "slaves": {"0": {"speed": 1}})"),
-         M + "slaves.0.speed: unknown key (known keys: slaveType, driverVersion, coreType, "
-             "cgVersion, cgAlphaVersion, edaVersion, word6, nextSlave, faulty, memory)"},
-        {withMaster(R"("slaveCount": 1, "slaves": {"0": {"memory": {"0x20000": 1}}})"),
-         M + "slaves.0.memory.0x20000: address 0x20000 is out of range 0..0x1FFFF"},
         {withMaster(R"("slaveCount": 1, "slaves": {"0": {"memory": {"0x1FFFE": [1, 2, 3]}}})"),
          M + "slaves.0.memory.0x1FFFE: 3 words from 0x1FFFE run past 0x1FFFF"},
         {withMaster(R"("slaveCount": 1, "slaves": {"0": {"memory": {"0x1FFE0": [0,0,0,0,0,0,0,0,
@@ -65,9 +53,6 @@ TEST(BoardReaderErrors, MessagesNameTheFileThePlaceAndTheProblem) {
              "(slaveType ... nextSlave)"},
         {R"({"devices": [], "devices": []})",
          "boards/x.json: devices: key \"devices\" is given twice"},
-        {R"([[[[[[[[[[[[[[[[[[[[[[[[[[[[[[[[[]]]]]]]]]]]]]]]]]]]]]]]]]]]]]]]]])",
-         "boards/x.json: [0][0][0][0][0][0][0][0][0][0][0][0][0][0][0][0][0][0][0][0][0][0][0]"
-         "[0][0][0][0][0][0][0][0][0]: nested deeper than 32 levels"},
     };
     for (const Case& c : cases) EXPECT_EQ(errorOf(c.json), c.message) << c.json;
 

@@ -40,12 +40,8 @@ void TestHost::clearMessages() {
 
 namespace {
 std::string describe(const std::vector<TestHost::Message>& messages) {
-    if (messages.empty()) return "no messages";
     std::string text = "messages:";
-    for (const auto& m : messages) {
-        text += "\n  [" + std::to_string(m.handle) + "] " + std::to_string(m.severity) + ": \"" +
-                m.text + "\"";
-    }
+    for (const auto& m : messages) text += "\n  " + std::to_string(m.severity) + " " + m.text;
     return text;
 }
 }  // namespace

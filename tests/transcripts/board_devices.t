@@ -19,37 +19,16 @@ count=1
 > getSlaveCount 0 4
 rc=0x00000000
 count=0
-> getSlaveCount 0 5
-rc=0x00000000
-count=0
-> getSlaveCount 1 1
-rc=0x00000000
-count=0
-> getSlaveCount 3 1
-rc=0x00000000
-count=0
-# peek and poke reach the chain's first master; a poked word is what a bus read delivers.
 > peek 0 7 1 0x5
 peek=0x0055
 > peek 0 2 0 0x5
 peek=0x0022
-> poke 0 2 0 0x1FFFF 0xFFFF
-> singleSlaveRead 0 2 0 0x1FFFF
-rc=0x00000000
-buffer=0xFFFF
-status=0
 > peek 0 7 0 0x5
 nebu: peek: no slave at position 0 (slaveCount 2)
-> peek 0 7 2 0x5
-nebu: peek: no slave at position 2 (slaveCount 2)
 > peek 0 7 1 0x20000
-nebu: ADDRESS 0x20000 is outside the bus (0..0x1FFFF)
-> poke 0 7 1 0x20000 1
 nebu: ADDRESS 0x20000 is outside the bus (0..0x1FFFF)
 > peek 0 4 0 0
 nebu: peek: device 0 chain 4 has no bus master
-> peek 0 8 0 0
-nebu: peek: device 0 chain 8 has no bus master
 > peek 3 7 0 0
 nebu: peek: the board has no device 3
 # exit 2

@@ -7,13 +7,6 @@ stats commands=0 writeBits=0 readBits=0 flushes=0 statusReads=0 roundTrips=0 cab
 $ nebu --board=../../boards/demo.json --board cli_board/memory.json --data-dir=../../data --session 0x10 --trace -e "peek 0 1 0 0x10"
 \> peek 0 1 0 0x10
 peek=0x1234
-$ nebu --tck-mhz 12.5 --round-trip-us=0 -e "singleSlaveRead 0 1 0 3" -e stats
-\> singleSlaveRead 0 1 0 3
-rc=0x00000000
-buffer=0x1234
-status=0
-\> stats
-stats commands=12 writeBits=86 readBits=37 flushes=0 statusReads=4 roundTrips=9 cableUs=10
 $ nebu --tck-mhz=1e1 --round-trip-us .5 -e "getSlaveCount 0 1" -e stats
 \> getSlaveCount 0 1
 rc=0x00000000
@@ -39,9 +32,6 @@ Type 'help' at the prompt (or -e help) for the commands.
 $ nebu --bogus -e stats
 nebu: unknown option '--bogus'
 [exit 2]
-$ nebu --board
-nebu: option --board needs an argument
-[exit 2]
 $ nebu --session 1x
 nebu: bad number '1x' for --session
 [exit 2]
@@ -63,9 +53,6 @@ nebu: cannot open script cli_board/missing.nebu
 $ nebu --tck-mhz 0
 nebu: --tck-mhz must be above 0, not 0
 [exit 2]
-$ nebu --tck-mhz 1e-999
-nebu: --tck-mhz must be above 0, not 1e-999
-[exit 2]
 $ nebu --tck-mhz -3
 nebu: bad number '-3' for --tck-mhz
 [exit 2]
@@ -74,12 +61,6 @@ nebu: bad number 'inf' for --tck-mhz
 [exit 2]
 $ nebu --tck-mhz 30MHz
 nebu: bad number '30MHz' for --tck-mhz
-[exit 2]
-$ nebu --tck-mhz=
-nebu: bad number '' for --tck-mhz
-[exit 2]
-$ nebu --round-trip-us 1.2.3
-nebu: bad number '1.2.3' for --round-trip-us
 [exit 2]
 $ nebu --round-trip-us
 nebu: option --round-trip-us needs an argument

@@ -1,12 +1,9 @@
 # nebu --session 9
-# Session, status and stats are the console's own: no call reaches the plug-in.
+# Session and stats are the console's own: no call reaches the plug-in.
 > stats
 stats commands=0 writeBits=0 readBits=0 flushes=0 statusReads=0 roundTrips=0 cableUs=0
 > session 3
-> status off
-> status on
 > endSession
-> endSession 9
 > stats
 stats commands=0 writeBits=0 readBits=0 flushes=0 statusReads=0 roundTrips=0 cableUs=0
 # Usage errors: one "nebu:" line each, and the console goes on.
@@ -14,12 +11,6 @@ stats commands=0 writeBits=0 readBits=0 flushes=0 statusReads=0 roundTrips=0 cab
 nebu: unknown command 'frobnicate'
 > peek 0 1 0 0x1G
 nebu: bad number '0x1G' for ADDRESS
-> session -1
-nebu: bad number '-1' for N
-> endSession 1 2
-nebu: usage: endSession [N]
-> stats x
-nebu: usage: stats
 > getSlaveCount 0
 nebu: usage: getSlaveCount D C
 > getRegisters 0 1 "2
