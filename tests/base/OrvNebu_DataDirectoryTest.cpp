@@ -199,6 +199,11 @@ TEST(DefinitionFiles, ProblemsWherePlacedAndWhatIsKept) {
         {'r', "A, ,0,0,3,,rw,,y\nB,2,0,0,3,,rw,,y\n", "lines 2 B/4", SAME},
         {'r', "A,1,0,x,3,,rw,,y\nB,2,0,0,3,,rw,,y\n", "lines 2 B/4", SAME},
         {'r', "A,1,.,0,3,,rw,,y\nB,2,0,0,3,,rw,,y\n", "lines 2 B/4", SAME},
+        {'r', "A,1,0,3,x,,rw,,y\nB,2,0,0,3,,rw,,y\n", "lines 2 B/4", SAME},
+        {'r', "A,1,9,9,9,,rw,,y\nB,2,0,0,3,,rw,,y\n",
+         "1:0:0 the first line is a register line, but the first line of a register file is its "
+         "header: register A is lost\nlines 2 B/4",
+         "lines 2 B/4"},
         {'r', "A,1,+5,0,3,,rw,,y\nB,2,0,0,3,,rw,,y\n",
          "1:0:0 the first line is a register line, but the first line of a register file is its "
          "header: register A is lost\n"

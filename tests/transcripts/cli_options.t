@@ -7,12 +7,13 @@ stats commands=0 writeBits=0 readBits=0 flushes=0 statusReads=0 roundTrips=0 cab
 $ nebu --board=../../boards/demo.json --board cli_board/memory.json --data-dir=../../data --session 0x10 --trace -e "peek 0 1 0 0x10"
 \> peek 0 1 0 0x10
 peek=0x1234
-$ nebu --tck-mhz=1e1 --round-trip-us .5 -e "getSlaveCount 0 1" -e stats
-\> getSlaveCount 0 1
+$ nebu --tck-mhz=1e1 --round-trip-us .5 -e "singleSlaveRead 0 1 0 3" -e stats
+\> singleSlaveRead 0 1 0 3
 rc=0x00000000
-count=8
+buffer=0x1234
+status=0
 \> stats
-stats commands=8 writeBits=38 readBits=11 flushes=0 statusReads=4 roundTrips=7 cableUs=8
+stats commands=12 writeBits=86 readBits=37 flushes=0 statusReads=4 roundTrips=9 cableUs=17
 $ nebu --help
 usage: nebu [--board FILE] [--data-dir DIR] [--session N] [--trace] [--plugin PATH] [--tck-mhz F]
             [--round-trip-us R] [-e COMMAND]... [SCRIPT]
@@ -34,9 +35,6 @@ nebu: unknown option '--bogus'
 [exit 2]
 $ nebu --session 1x
 nebu: bad number '1x' for --session
-[exit 2]
-$ nebu --trace=yes
-nebu: option --trace takes no argument
 [exit 2]
 $ nebu a.nebu b.nebu
 nebu: more than one script: 'a.nebu', 'b.nebu'
