@@ -23,8 +23,6 @@ count=0
 peek=0x0055
 > peek 0 2 0 0x5
 peek=0x0022
-> peek 0 7 0 0x5
-nebu: peek: no slave at position 0 (slaveCount 2)
 > peek 0 7 1 0x20000
 nebu: ADDRESS 0x20000 is outside the bus (0..0x1FFFF)
 > peek 0 4 0 0

@@ -11,8 +11,6 @@ stats commands=0 writeBits=0 readBits=0 flushes=0 statusReads=0 roundTrips=0 cab
 nebu: unknown command 'frobnicate'
 > peek 0 1 0 0x1G
 nebu: bad number '0x1G' for ADDRESS
-> getSlaveCount 0
-nebu: usage: getSlaveCount D C
 > getRegisters 0 1 "2
 nebu: unterminated quote in: getRegisters 0 1 "2
 > peek 0 1 0 0x0010

@@ -54,6 +54,16 @@ txusrclk0_freq=500000000000000024173346057776829528764197422945257127936.000000
 # Setting at width 16 (no multiple of 10: the flagged clocks run at rate / 8) writes both output
 # dividers and every window.
 > poke 0 2 0 0x04 0x0280
+# A rate below the data width gives windows of 0, and so does a window under one count (a
+# tiny system clock).
+> setParameters 0 2 0 "line_rate0=1 FB=2, REF=1, DIVSEL=1" sysclk_freq=50
+rc=0x00000000
+> peek 0 2 0 0x10 4
+peek=0xDABE 0x0000 0xC7FD 0xFFFF
+> setParameters 0 2 0 "line_rate0=1e15 FB=2, REF=1, DIVSEL=1" sysclk_freq=1e-320
+rc=0x00000000
+> peek 0 2 0 0x10 4
+peek=0xDABE 0x0000 0xC7FD 0xFFFF
 > setParameters 0 2 0 "line_rate0=1250.000 FB=2, REF=1, DIVSEL=2 and more" sysclk_freq=10
 rc=0x00000000
 > peek 0 2 0 0x04 36
